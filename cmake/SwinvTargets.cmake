@@ -1,0 +1,36 @@
+# What every target of the project shares, and the few shapes that targets come in.
+
+add_library(swinv_options INTERFACE)
+target_compile_options(swinv_options INTERFACE
+  -Wall -Wextra -Wpedantic -Wshadow -Wconversion -Werror)
+if(SWINV_SANITIZE)
+  target_compile_options(swinv_options INTERFACE -fsanitize=${SWINV_SANITIZE} -fno-omit-frame-pointer)
+  target_link_options(swinv_options INTERFACE -fsanitize=${SWINV_SANITIZE})
+  if(SWINV_SANITIZE MATCHES undefined)
+    target_compile_options(swinv_options INTERFACE -fno-sanitize-recover=undefined)
+  endif()
+else()
+  target_link_options(swinv_options INTERFACE LINKER:--no-undefined)
+endif()
+target_link_options(swinv_options INTERFACE LINKER:--as-needed)
+link_libraries(swinv_options)
+
+# swinv_export_only(TARGET FILE): exports what the linker map FILE lists, and nothing else.
+function(swinv_export_only target map)
+  target_link_options(${target} PRIVATE LINKER:--version-script=${map})
+  set_property(TARGET ${target} APPEND PROPERTY LINK_DEPENDS ${map})
+endfunction()
+
+# swinv_test(NAME SOURCES file... [LIBRARIES target...] [DEPENDS target...] [DEFINITIONS name=value...])
+# A GoogleTest program; each of its cases is a test of its own under CTest.
+function(swinv_test name)
+  cmake_parse_arguments(ARG "" "" "SOURCES;LIBRARIES;DEPENDS;DEFINITIONS" ${ARGN})
+  add_executable(${name} ${ARG_SOURCES})
+  target_link_libraries(${name} PRIVATE ${ARG_LIBRARIES} GTest::gmock GTest::gtest_main)
+  target_compile_definitions(${name} PRIVATE ${ARG_DEFINITIONS})
+  if(ARG_DEPENDS)
+    add_dependencies(${name} ${ARG_DEPENDS})
+  endif()
+  gtest_discover_tests(${name} DISCOVERY_MODE PRE_TEST DISCOVERY_TIMEOUT 120
+    PROPERTIES TIMEOUT 300 ENVIRONMENT "TZ=UTC")
+endfunction()
