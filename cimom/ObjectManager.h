@@ -1,12 +1,13 @@
-// A small CIM object manager: classes read from MOF, providers loaded through CMPI, requests dispatched to them.
+// A small CIM object manager: classes read from MOF, providers loaded through CMPI, requests dispatched to
+// them.
 //
-// It knows classes and providers only from what it is configured with, and nothing of what any provider is about.
-// Threads: requests may be made from several threads at once.
+// It knows classes and providers only from what it is configured with, and nothing of what any provider is
+// about. Threads: requests may be made from several threads at once.
 #pragma once
 
-#include <cimom/ClassRepository.h>
-#include <cimom/Objects.h>
 #include <cimom/ProviderRegistration.h>
+#include <cimom/broker/Objects.h>
+#include <cimom/mof/ClassRepository.h>
 #include <cmpi/cmpidt.h>
 
 #include <filesystem>
@@ -28,19 +29,21 @@ struct Status {
 /// How a request ended. What was delivered before stays delivered, whatever this says.
 struct Outcome {
   Status status;
-  /// The provider sent the done marker. False after an OK means: it stopped early, for a reason in its own log.
+  /// The provider sent the done marker. False after an OK means: it stopped early, for a reason in its own
+  /// log.
   bool done = false;
   std::size_t delivered = 0;  ///< objects handed to the sink
 };
 
 struct Configuration {
-  std::vector<std::filesystem::path> schema;          ///< MOF files, in the order in which they are compiled
-  std::vector<ProviderRegistration> providers;        ///< which library serves which classes
-  std::filesystem::path providerFolder;               ///< where libNAME.so of a registration is looked for
-  std::function<void(std::string_view)> log;          ///< one line of diagnostics a call; empty: none
+  std::vector<std::filesystem::path> schema;    ///< MOF files, in the order in which they are compiled
+  std::vector<ProviderRegistration> providers;  ///< which library serves which classes
+  std::filesystem::path providerFolder;         ///< where libNAME.so of a registration is looked for
+  std::function<void(std::string_view)> log;    ///< one line of diagnostics a call; empty: none
 };
 
-/// Takes each object while it is valid: only during the call. Returning false ends the delivery, not the request.
+/// Takes each object while it is valid: only during the call. Returning false ends the delivery, not the
+/// request.
 using InstanceSink = std::function<bool(const Instance&)>;
 using PathSink = std::function<bool(const ObjectPath&)>;
 
@@ -49,8 +52,8 @@ using PropertyList = std::optional<std::vector<std::string>>;
 
 class ObjectManager {
  public:
-  /// Reads the schema. Throws `MofError` (file, line, what was expected) or `std::runtime_error`. Providers are loaded
-  /// when a request first needs them; `tzset` is called once before.
+  /// Reads the schema. Throws `MofError` (file, line, what was expected) or `std::runtime_error`. Providers
+  /// are loaded when a request first needs them; `tzset` is called once before.
   explicit ObjectManager(Configuration configuration);
   ~ObjectManager();
   ObjectManager(const ObjectManager&) = delete;
@@ -58,14 +61,16 @@ class ObjectManager {
 
   [[nodiscard]] const ClassRepository& classes() const;
 
-  /// CMPI_RC_ERR_INVALID_CLASS for a class that the schema lacks, CMPI_RC_ERR_NOT_SUPPORTED for one without a provider,
-  /// CMPI_RC_ERR_FAILED where the provider's library cannot be loaded (the description says why).
-  Outcome enumerateInstances(std::string_view nameSpace, std::string_view className, const PropertyList& properties,
-                             const InstanceSink& sink);
-  Outcome enumerateInstanceNames(std::string_view nameSpace, std::string_view className, const PathSink& sink);
+  /// CMPI_RC_ERR_INVALID_CLASS for a class that the schema lacks, CMPI_RC_ERR_NOT_SUPPORTED for one without a
+  /// provider, CMPI_RC_ERR_FAILED where the provider's library cannot be loaded (the description says why).
+  Outcome enumerateInstances(std::string_view nameSpace, std::string_view className,
+                             const PropertyList& properties, const InstanceSink& sink);
+  Outcome enumerateInstanceNames(std::string_view nameSpace, std::string_view className,
+                                 const PathSink& sink);
 
-  /// One instance or a status: CMPI_RC_ERR_INVALID_PARAMETER where keys do not fit the class, CMPI_RC_ERR_NOT_FOUND
-  /// where the provider's answer is none, more than one, or one with other keys. `path` is a WBEM URI text
+  /// One instance or a status: CMPI_RC_ERR_INVALID_PARAMETER where keys do not fit the class,
+  /// CMPI_RC_ERR_NOT_FOUND where the provider's answer is none, more than one, or one with other keys. `path`
+  /// is a WBEM URI text
   /// (`formatWbemUri`), with or without the namespace.
   Outcome getInstance(std::string_view path, const PropertyList& properties, const InstanceSink& sink);
 

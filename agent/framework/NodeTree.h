@@ -1,8 +1,8 @@
 // The machine as an immutable tree of typed nodes.
 //
-// Nodes stand in one array in pre-order, so that everything below a node, at any depth, is a range of indices. Texts
-// and properties lie in pools beside it. A tree is built once (`NodeTreeBuilder`), never changed, and may be read from
-// any number of threads.
+// Nodes stand in one array in pre-order, so that everything below a node, at any depth, is a range of
+// indices. Texts and properties lie in pools beside it. A tree is built once (`NodeTreeBuilder`), never
+// changed, and may be read from any number of threads.
 #pragma once
 
 #include <Oru/NodeLexicon.h>
@@ -18,7 +18,8 @@
 
 namespace agent {
 
-/// The number of a node: its identity over restarts, updates and renamings. Its hexadecimal text is the node's path.
+/// The number of a node: its identity over restarts, updates and renamings. Its hexadecimal text is the
+/// node's path.
 using NodeNumber = std::uint64_t;
 
 /// Types and properties of the framework's own start here; the numbers below are the contract's.
@@ -79,7 +80,8 @@ class NodeTree {
   /// The nearest computer system at or above `node`, or `none`.
   [[nodiscard]] Index computer(Index node) const { return nodes_[node].computer; }
   [[nodiscard]] std::string_view description(Index node) const { return view(nodes_[node].description); }
-  /// What the number was made of, with the type: the node's place on its bus. May be empty (numbers given outright).
+  /// What the number was made of, with the type: the node's place on its bus. May be empty (numbers given
+  /// outright).
   [[nodiscard]] std::string_view position(Index node) const { return view(nodes_[node].position); }
 
   /// A text property; nothing where the node has none of that id, or has it as a number.
@@ -151,18 +153,18 @@ class DuplicateNumber : public std::runtime_error {
 
 /// Gathers nodes in any order of parents before children, then makes a tree of them.
 ///
-/// The order of siblings is the order in which they were added. A node's number is made of its type and its position;
-/// the number of one tree's node therefore does not depend on any other node, except where two would get the same
-/// number: then the one whose (type, position) sorts first keeps it and the others get the number of
-/// (type, position, n) for n = 2, 3, ...; nodes of the same type and position are told apart by their order in the tree.
-/// Numbers are made with 60 bits, so that their text stays short, and are never 0.
+/// The order of siblings is the order in which they were added. A node's number is made of its type and its
+/// position; the number of one tree's node therefore does not depend on any other node, except where two
+/// would get the same number: then the one whose (type, position) sorts first keeps it and the others get the
+/// number of (type, position, n) for n = 2, 3, ...; nodes of the same type and position are told apart by
+/// their order in the tree. Numbers are made with 60 bits, so that their text stays short, and are never 0.
 class NodeTreeBuilder {
  public:
   using Handle = std::size_t;
   static constexpr Handle noParent = ~Handle{0};
 
-  /// Adds a node below `parent` (an earlier handle, or `noParent`). `description` and `position` are taken through
-  /// `cleanText`.
+  /// Adds a node below `parent` (an earlier handle, or `noParent`). `description` and `position` are taken
+  /// through `cleanText`.
   Handle add(Handle parent, int type, std::string_view position, std::string_view description);
   /// Gives a node its number outright.
   void setNumber(Handle node, NodeNumber number);
@@ -196,8 +198,8 @@ class NodeTreeBuilder {
 /// The number that a type and a position make: the same on every machine, for ever.
 NodeNumber numberFor(int type, std::string_view position);
 
-/// `text` without blanks and control characters at both ends, made valid UTF-8 (each byte that is not becomes U+FFFD),
-/// with a blank in place of each control character inside.
+/// `text` without blanks and control characters at both ends, made valid UTF-8 (each byte that is not becomes
+/// U+FFFD), with a blank in place of each control character inside.
 std::string cleanText(std::string_view text);
 
 /// The path text of a number: lower-case hexadecimal without leading zeros.
