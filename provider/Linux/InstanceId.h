@@ -1,0 +1,28 @@
+// The InstanceID of a software element: the number of its parent in decimal, "@", its own path text.
+//
+// Example: parent text 1a and node text xyz give 26@xyz. A parent's number alone, without "@", stands for all
+// software below that parent.
+#pragma once
+
+#include <cstdint>
+#include <string>
+#include <string_view>
+
+namespace Oru::SoftwareInventoryProfileProvider {
+
+/// The InstanceID of a node, from the path texts of its parent and of itself. A parent text that does not
+/// begin with a hexadecimal number counts as 0.
+std::string makeInstanceId(std::string_view parentText, std::string_view nodeText);
+
+/// What an InstanceID says, as stream extraction reads it: a decimal number, one character, a word.
+struct InstanceIdParts {
+  std::uint64_t parent = 0;
+  std::string_view pathText;  ///< points into the text that was parsed; empty where it does not go so far
+};
+InstanceIdParts parseInstanceId(std::string_view instanceId);
+
+/// The path text of the parent that an identifier begins with: its decimal number in lower-case hexadecimal.
+/// What does not begin with a number counts as 0.
+std::string parentPathText(std::string_view identifier);
+
+}  // namespace Oru::SoftwareInventoryProfileProvider

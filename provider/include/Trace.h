@@ -1,0 +1,294 @@
+// What the provider says of itself: one vocabulary of texts, sent to the logger's two channels.
+//
+// Every event is formatted by a helper into that helper's static buffer, and goes first to the log and then
+// to the trace channel, formatted afresh for each. Where the logger can tell that a level is off for a
+// channel, nothing is formatted for it. Call sites say an event once:
+//
+//   TraceScope scope(loggerSoftwareIdentity, " filterType=", type);    entry now, exit when the function
+//   returns traceMethod(loggerSoftwareInventoryProvider);                      a function that does little
+//   was invoked traceMessage(loggerSoftwareIdentity, "Complete Path has been passed");
+//   traceVariable(loggerCMPISoftwareIdentity, "instanceID", value);
+//   traceException(loggerSoftwareInventoryProvider, exception);        the one event at the error level
+//
+// Function, file and line of the call come by themselves. Files are named relative to provider/, by the
+// compiler's prefix map.
+//
+// Threads: each thread formats into buffers of its own.
+#pragma once
+
+#include <Oru/Moniker.h>
+#include <ZelLog/ZelLogger.h>
+#include <ZelLog/ZelMessageBuffer.h>
+
+#include <cstdio>
+#include <cstring>
+#include <exception>
+#include <locale>
+#include <sstream>
+#include <string>
+
+namespace Oru::SoftwareInventoryProfileProvider {
+
+/// Kind of a message. Any other value counts as ENTERING.
+enum MessageType { ENTERING = 0, EXITING = 1, METHOD = 2, MESSAGE = 3 };
+
+inline constexpr const char* traceCategory = "Corvane.SoftwareInventoryProvider";
+inline constexpr int routineLevel = 4000;
+inline constexpr int errorLevel = 3000;
+inline constexpr std::size_t traceBufferSize = 512;
+inline constexpr const char* traceSeparator =
+    "==============================================================================";
+
+/// The place that reports an event: `CallSite::here()` as a default argument is the caller's.
+struct CallSite {
+  const char* function;
+  const char* file;
+  unsigned int line;
+
+  static constexpr CallSite here(const char* function = __builtin_FUNCTION(),
+                                 const char* file = __builtin_FILE(), unsigned int line = __builtin_LINE()) {
+    return {function, file, line};
+  }
+};
+
+/// A logger category and the place that names it: made where a category is handed to a function of this
+/// header.
+struct LogPoint {
+  // Not explicit, so that a call site names the category alone.
+  LogPoint(const std::string& category,
+           CallSite place = CallSite::here())  // NOLINT(google-explicit-constructor)
+      : logger(category), site(place) {}
+
+  const std::string& logger;
+  CallSite site;
+};
+
+// ---- The texts. Each helper returns its own buffer, of the calling thread, and cuts longer texts at 511
+// characters.
+
+namespace trace_detail {
+
+using Buffer = char[traceBufferSize];
+
+inline const char* orNull(const char* text) {
+  return text != nullptr ? text : "(null)";
+}
+
+template <typename... Values>
+char* format(Buffer& buffer, const char* pattern, Values... values) {
+  std::memset(buffer, 0, sizeof(buffer));
+#pragma GCC diagnostic push
+#pragma GCC diagnostic ignored "-Wformat-nonliteral"
+#pragma GCC diagnostic ignored "-Wformat-security"
+  std::snprintf(buffer, sizeof(buffer), pattern, values...);
+#pragma GCC diagnostic pop
+  return buffer;
+}
+
+}  // namespace trace_detail
+
+/// The text of an event. `text` is a function name, or for MESSAGE the message.
+inline char* trace(const char* text, const char* file, unsigned int line, MessageType type) {
+  static thread_local trace_detail::Buffer buffer;
+  const char* name = trace_detail::orNull(text);
+  const char* source = trace_detail::orNull(file);
+  switch (type) {
+    case EXITING:
+      return trace_detail::format(buffer, "EXITING: %s() in %s [Line: %d]", name, source, line);
+    case METHOD:
+      return trace_detail::format(buffer, "METHOD: %s() was invoked in %s [Line: %d]", name, source, line);
+    case MESSAGE:
+      return trace_detail::format(buffer, "MESSAGE [File: %s, Line: %d]: %s", source, line, name);
+    default:
+      return trace_detail::format(buffer, "ENTERING: %s() in %s [Line: %d]", name, source, line);
+  }
+}
+
+/// The text of an event with the function's parameters.
+inline char* tracepara(const char* text, const char* file, unsigned int line, const char* parameters,
+                       MessageType type) {
+  static thread_local trace_detail::Buffer buffer;
+  const char* name = trace_detail::orNull(text);
+  const char* source = trace_detail::orNull(file);
+  const char* list = trace_detail::orNull(parameters);
+  switch (type) {
+    case EXITING:
+      return trace_detail::format(buffer, "EXITING: %s() in %s [Line: %d],Parameters List: %s", name, source,
+                                  line, list);
+    case METHOD:
+      return trace_detail::format(buffer, "METHOD: %s() was invoked in %s [Line: %d],Parameters List: %s",
+                                  name, source, line, list);
+    case MESSAGE:
+      return trace_detail::format(buffer, "MESSAGE [File: %s, Line: %d]: %s,Parameters List: %s", source,
+                                  line, name, list);
+    default:
+      return trace_detail::format(buffer, "ENTERING: %s() in %s [Line: %d],Parameters List: %s", name, source,
+                                  line, list);
+  }
+}
+
+/// The text of a variable. `name` is the variable as written in the source; null values print as "(null)".
+inline char* trace(const char* name, const char* file, unsigned int line, const char* value) {
+  static thread_local trace_detail::Buffer buffer;
+  return trace_detail::format(buffer, "VARIABLE: '%s' has Value '%s' at line %d in %s",
+                              trace_detail::orNull(name), trace_detail::orNull(value), line,
+                              trace_detail::orNull(file));
+}
+
+inline char* trace(const char* name, const char* file, unsigned int line, const std::string& value) {
+  return trace(name, file, line, value.c_str());
+}
+
+/// The text of an integer variable.
+inline char* traceInteger(const char* name, const char* file, unsigned int line, int value) {
+  static thread_local trace_detail::Buffer buffer;
+  return trace_detail::format(buffer, "VARIABLE: '%s' has Value '%d' at line %d in %s",
+                              trace_detail::orNull(name), value, line, trace_detail::orNull(file));
+}
+
+/// A moniker as its name=value pairs, joined by commas. The moniker's own key selection stays where it is.
+inline std::string monikerText(Moniker moniker) {
+  std::string text;
+  for (unsigned int i = 0; i < moniker.getKeyCount(); ++i) {
+    std::string name;
+    std::string value;
+    if (!moniker.selectKey(i) || !moniker.getName(name) || !moniker.getValue(value)) {
+      continue;
+    }
+    if (!text.empty()) {
+      text += ',';
+    }
+    text.append(name).append("=").append(value);
+  }
+  return text;
+}
+
+// ---- The events.
+
+namespace trace_detail {
+
+// A logger library may lack the test; then every level counts as on.
+inline bool isOn(ZelLog::ZelChannel channel, int level) {
+  return &ZelLog::ZelLogger::isLevelOn == nullptr || ZelLog::ZelLogger::isLevelOn(channel, level);
+}
+
+inline bool isOn(int level) {
+  return isOn(ZelLog::ZelChannel::Log, level) || isOn(ZelLog::ZelChannel::Trace, level);
+}
+
+/// Sends the text that `text` makes to each channel that takes the level.
+template <typename Text>
+void emit(const LogPoint& point, int level, Text text) {
+  if (isOn(ZelLog::ZelChannel::Log, level)) {
+    ZelLog::ZelMessageBuffer buffer;
+    ZelLog::ZelLogger::logLevelMessage(point.site.function, point.site.file, point.site.line, point.logger,
+                                       level, nullptr, 0, 0, str(buffer << text()));
+  }
+  if (isOn(ZelLog::ZelChannel::Trace, level)) {
+    ZelLog::ZelMessageBuffer buffer;
+    ZelLog::ZelLogger::traceLevelMessage(point.site.function, point.site.file, point.site.line, point.logger,
+                                         level, nullptr, 0, 0, str(buffer << text()));
+  }
+}
+
+inline void emitEvent(const LogPoint& point, MessageType type) {
+  emit(point, routineLevel,
+       [&] { return trace(point.site.function, point.site.file, point.site.line, type); });
+}
+
+template <typename Value>
+void appendParameter(std::ostream& list, const Value& value) {
+  list << value;
+}
+inline void appendParameter(std::ostream& list, const Moniker& value) {
+  list << monikerText(value);
+}
+
+template <typename... Values>
+std::string parameterList(const Values&... values) {
+  std::ostringstream list;
+  list.imbue(std::locale::classic());
+  (appendParameter(list, values), ...);
+  return list.str();
+}
+
+}  // namespace trace_detail
+
+/// One METHOD event, of a function that has no entry and exit worth telling apart.
+inline void traceMethod(const LogPoint& point) {
+  trace_detail::emitEvent(point, METHOD);
+}
+
+/// One MESSAGE event with a free text.
+inline void traceMessage(const LogPoint& point, const char* text) {
+  trace_detail::emit(point, routineLevel,
+                     [&] { return trace(text, point.site.file, point.site.line, MESSAGE); });
+}
+
+/// One MESSAGE event at the error level, with the exception's text.
+inline void traceException(const LogPoint& point, const std::exception& exception) {
+  trace_detail::emit(point, errorLevel,
+                     [&] { return trace(exception.what(), point.site.file, point.site.line, MESSAGE); });
+}
+
+/// One variable with its value.
+inline void traceVariable(const LogPoint& point, const char* name, const std::string& value) {
+  trace_detail::emit(point, routineLevel,
+                     [&] { return trace(name, point.site.file, point.site.line, value); });
+}
+inline void traceVariable(const LogPoint& point, const char* name, int value) {
+  trace_detail::emit(point, routineLevel,
+                     [&] { return traceInteger(name, point.site.file, point.site.line, value); });
+}
+
+/// Entry and exit of a function: ENTERING, with the parameters where there are any, when it is made; EXITING
+/// when the function returns. A function that is left by an exception has no exit event: the trace shows how
+/// deep it came from. Both events name the line of the scope.
+class TraceScope {
+ public:
+  template <typename... Parameters>
+  explicit TraceScope(const LogPoint& point, const Parameters&... parameters) : point_(point) {
+    if (!trace_detail::isOn(routineLevel)) {
+      return;
+    }
+    exceptionsAtEntry_ = std::uncaught_exceptions();
+    if constexpr (sizeof...(parameters) == 0) {
+      trace_detail::emitEvent(point_, ENTERING);
+    } else {
+      trace_detail::emit(point_, routineLevel, [&] {
+        const std::string list = trace_detail::parameterList(parameters...);
+        return tracepara(point_.site.function, point_.site.file, point_.site.line, list.c_str(), ENTERING);
+      });
+    }
+  }
+
+  ~TraceScope() {
+    if (trace_detail::isOn(routineLevel) && std::uncaught_exceptions() <= exceptionsAtEntry_) {
+      trace_detail::emitEvent(point_, EXITING);
+    }
+  }
+
+  TraceScope(const TraceScope&) = delete;
+  TraceScope& operator=(const TraceScope&) = delete;
+
+ private:
+  LogPoint point_;
+  int exceptionsAtEntry_ = 0;
+};
+
+/// The banner at the start of every function of the provider interface that does real work: the separator
+/// line, as this helper's own event, then ENTERING for the function.
+inline void markProviderEntry(const std::string& logger, const char* function = __builtin_FUNCTION(),
+                              const char* file = __builtin_FILE(), unsigned int line = __builtin_LINE()) {
+  trace_detail::emit(logger, routineLevel, [] { return traceSeparator; });
+  trace_detail::emitEvent(LogPoint(logger, {function, file, line}), ENTERING);
+}
+
+/// Its mirror at the end: EXITING, then the separator line.
+inline void markProviderExit(const std::string& logger, const char* function = __builtin_FUNCTION(),
+                             const char* file = __builtin_FILE(), unsigned int line = __builtin_LINE()) {
+  trace_detail::emitEvent(LogPoint(logger, {function, file, line}), EXITING);
+  trace_detail::emit(logger, routineLevel, [] { return traceSeparator; });
+}
+
+}  // namespace Oru::SoftwareInventoryProfileProvider
