@@ -132,16 +132,22 @@ class NodeTree {
   };
 
   [[nodiscard]] std::string_view view(TextRange range) const {
-    return std::string_view(texts_).substr(range.begin, range.length);
+    return {texts_.data() + range.begin, range.length};
   }
   [[nodiscard]] const Property* findProperty(Index node, int property) const;
+  void indexTypes();
+  void indexNumbers();
 
   std::vector<Node> nodes_;
   std::vector<Property> properties_;
   std::string texts_;
   std::vector<TypeRange> typeRanges_;  ///< by rising type; ranges of byType_
   std::vector<Index> byType_;
-  std::vector<Index> byNumber_;  ///< by rising number
+  /// Nodes by rising mixed number, in buckets by its upper bits: a look-up takes one step on most numbers and
+  /// is a binary search in one bucket on the worst.
+  std::vector<Index> byNumber_;
+  std::vector<std::uint32_t> bucketBegins_;  ///< of each bucket in byNumber_, and the end of the last
+  int bucketShift_ = 63;
   std::vector<SourceReport> reports_;
 };
 
@@ -162,41 +168,64 @@ class NodeTreeBuilder {
  public:
   using Handle = std::size_t;
   static constexpr Handle noParent = ~Handle{0};
+  /// Makes the number of the n-th (from 1) claim of a type and position.
+  using NumberMaker = NodeNumber (*)(int type, std::string_view position, std::uint32_t n);
 
   /// Adds a node below `parent` (an earlier handle, or `noParent`). `description` and `position` are taken
-  /// through `cleanText`.
+  /// through `cleanText`. Throws `std::invalid_argument` for another parent and for a negative type.
   Handle add(Handle parent, int type, std::string_view position, std::string_view description);
+  /// Replaces what `add` was given: for readers that meet a node's children before its own texts.
+  void describe(Handle node, int type, std::string_view position, std::string_view description);
   /// Gives a node its number outright.
   void setNumber(Handle node, NodeNumber number);
-  /// Sets a text property; a text that is empty after `cleanText` sets nothing: absent is absent.
+  /// Sets a text property; a text that is empty after `cleanText` sets nothing: absent is absent. Of several
+  /// settings of one property the last stands. Throws `std::invalid_argument` for a negative property.
   void setText(Handle node, int property, std::string_view text);
-  /// Sets a number property.
+  /// Sets a number property; as above.
   void setValue(Handle node, int property, std::uint32_t number);
+  /// Adds a report; its texts are taken through `cleanText`.
   void addReport(SourceReport report);
 
   /// Throws `DuplicateNumber` where numbers that were given outright clash. The builder is empty afterwards.
   NodeTree build();
+  /// The same with other numbers: for tests, because collisions of the true ones cannot be had.
+  NodeTree build(NumberMaker makeNumber);
 
  private:
+  using Index = NodeTree::Index;
   struct Draft {
     Handle parent = noParent;
     int type = 0;
-    std::string position;
-    std::string description;
+    NodeTree::TextRange position;
+    NodeTree::TextRange description;
     std::optional<NodeNumber> number;
-    struct Property {
-      int id = 0;
-      std::optional<std::string> text;
-      std::uint32_t number = 0;
-    };
-    std::vector<Property> properties;
   };
+  struct PropertyDraft {
+    Handle node = noParent;
+    NodeTree::Property property;
+  };
+
+  NodeTree::TextRange keep(std::string_view text);
+  void setProperty(Handle node, NodeTree::Property property);
+  [[nodiscard]] std::vector<Handle> preOrder() const;
+  void placeNodes(NodeTree& tree, const std::vector<Handle>& order, const std::vector<Index>& indexOf) const;
+  void placeProperties(NodeTree& tree, const std::vector<Index>& indexOf) const;
+  void giveNumbers(NodeTree& tree, const std::vector<Handle>& order, NumberMaker makeNumber) const;
+
   std::vector<Draft> drafts_;
+  std::vector<PropertyDraft> properties_;
+  std::string texts_;
   std::vector<SourceReport> reports_;
 };
 
-/// The number that a type and a position make: the same on every machine, for ever.
-NodeNumber numberFor(int type, std::string_view position);
+/// The number that a type and a position make: the same on every machine, for ever. `n` above 1 is for the
+/// n-th claim of one type and position (see `NodeTreeBuilder`).
+///
+/// 1 for the computer system at `computerPosition`. Else FNV-1a (64 bits) over the type as four bytes, least
+/// significant first, and the bytes of the position, and where `n` is above 1 also a zero byte and `n` as
+/// four bytes, least significant first; then the 64-bit finaliser `mix64`; then the upper four bits are
+/// folded onto the lower ones. 0 and 1 are taken for this and read as 2 and 3.
+NodeNumber numberFor(int type, std::string_view position, std::uint32_t n = 1);
 
 /// `text` without blanks and control characters at both ends, made valid UTF-8 (each byte that is not becomes
 /// U+FFFD), with a blank in place of each control character inside.
@@ -204,5 +233,9 @@ std::string cleanText(std::string_view text);
 
 /// The path text of a number: lower-case hexadecimal without leading zeros.
 std::string pathText(NodeNumber number);
+
+/// The number that a text of hexadecimal digits of either case stands for, leading zeros allowed; nothing
+/// where the text is empty, holds anything else, or needs more than 64 bits.
+std::optional<NodeNumber> numberFromText(std::string_view text);
 
 }  // namespace agent

@@ -1,0 +1,35 @@
+#include <agent/discovery/Discovery.h>
+#include <agent/framework/InventoryFile.h>
+#include <agent/framework/TreeSource.h>
+
+#include <cstdlib>
+
+namespace agent {
+namespace {
+
+std::optional<std::filesystem::path> pathFromEnvironment(const char* name) {
+  const char* value = std::getenv(name);
+  if (value == nullptr || *value == '\0') {
+    return std::nullopt;
+  }
+  return std::filesystem::path(value);
+}
+
+}  // namespace
+
+TreeSource TreeSource::fromEnvironment() {
+  return {pathFromEnvironment("ORU_INVENTORY"), pathFromEnvironment("ORU_SYSTEM_ROOT")};
+}
+
+NodeTree readTree(const TreeSource& source) {
+  if (source.inventory) {
+    return readInventoryFile(*source.inventory);
+  }
+  DiscoveryOptions options;
+  if (source.systemRoot) {
+    options.root = *source.systemRoot;
+  }
+  return discover(options);
+}
+
+}  // namespace agent
