@@ -95,6 +95,7 @@ struct QualifierDeclaration {
   std::vector<std::string> scopes;   ///< as written
   std::vector<std::string> flavors;  ///< as written
   std::uint32_t arraySize = 0;
+  int line = 0;
 
   [[nodiscard]] bool toSubclass() const;  ///< subclasses inherit it: all but those of flavor Restricted
 };
