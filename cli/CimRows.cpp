@@ -1,0 +1,250 @@
+#include <cimom/Names.h>
+#include <cimom/broker/WbemUri.h>
+#include <cli/CimRows.h>
+#include <cli/CimStatus.h>
+#include <cli/Messages.h>
+#include <cli/Text.h>
+
+#include <algorithm>
+#include <array>
+#include <charconv>
+#include <string_view>
+#include <utility>
+
+namespace cli {
+namespace {
+
+/// A table's properties of a software identity, with the order in which a narrow terminal loses them.
+constexpr std::array<std::pair<const char*, int>, 6> tellingProperties{{{"InstanceID", 0},
+                                                                        {"Description", 0},
+                                                                        {"VersionString", 0},
+                                                                        {"Manufacturer", 2},
+                                                                        {"ReleaseDate", 1},
+                                                                        {"Classifications", 3}}};
+
+std::vector<std::string> textsOf(const cimom::mof::Property& property, std::string_view qualifierName) {
+  std::vector<std::string> texts;
+  const auto* qualifier = cimom::mof::findQualifier(property.qualifiers, qualifierName);
+  if (qualifier != nullptr) {
+    for (const auto& element : qualifier->value.elements) {
+      const auto* text = std::get_if<std::string>(&element);
+      texts.push_back(text == nullptr ? std::string() : *text);
+    }
+  }
+  return texts;
+}
+
+/// The qualifiers ValueMap and Values side by side, ranges left out. Without a ValueMap, values count from 0.
+std::map<std::uint64_t, std::string> valueNames(const cimom::mof::Property& property) {
+  std::map<std::uint64_t, std::string> names;
+  const std::vector<std::string> values = textsOf(property, "Values");
+  const std::vector<std::string> map = textsOf(property, "ValueMap");
+  for (std::size_t i = 0; i < values.size(); ++i) {
+    std::uint64_t number = i;
+    if (!map.empty()) {
+      const std::string_view text = i < map.size() ? std::string_view(map[i]) : std::string_view();
+      const auto result = std::from_chars(text.data(), text.data() + text.size(), number);
+      if (result.ec != std::errc() || result.ptr != text.data() + text.size()) {
+        continue;
+      }
+    }
+    names.emplace(number, values[i]);
+  }
+  return names;
+}
+
+Column columnOf(const cimom::mof::Property& property) {
+  const CMPIType type = property.type;
+  return {property.name, valueNames(property), type == CMPI_dateTime || (property.key && type == CMPI_string),
+          0};
+}
+
+std::string utf8(CMPIChar16 unit) {
+  const unsigned code = unit;
+  std::string text;
+  if (code < 0x80) {
+    text += static_cast<char>(code);
+  } else if (code < 0x800) {
+    text += static_cast<char>(0xC0U | (code >> 6U));
+    text += static_cast<char>(0x80U | (code & 0x3FU));
+  } else {
+    text += static_cast<char>(0xE0U | (code >> 12U));
+    text += static_cast<char>(0x80U | ((code >> 6U) & 0x3FU));
+    text += static_cast<char>(0x80U | (code & 0x3FU));
+  }
+  return text;
+}
+
+/// Objects by their text, all else null.
+Scalar objectScalar(const CMPIData& data) {
+  if (const auto text = cimom::text(data)) {
+    return std::string(*text);
+  }
+  if (const auto text = cimom::dateTimeText(data)) {
+    return DateTime{std::string(*text)};
+  }
+  if (const cimom::ObjectPath* path = cimom::objectPath(data)) {
+    return Reference{cimom::formatWbemUri(*path)};
+  }
+  if (const cimom::Instance* instance = cimom::instance(data)) {
+    return Reference{cimom::formatWbemUri(instance->path())};
+  }
+  return std::monostate{};
+}
+
+Scalar scalarOf(const CMPIData& data) {
+  if (cimom::isNull(data)) {
+    return std::monostate{};
+  }
+  switch (data.type) {
+    case CMPI_boolean:
+      return data.value.boolean != 0;
+    case CMPI_char16:
+      return utf8(data.value.char16);
+    case CMPI_uint8:
+      return std::uint64_t{data.value.uint8};
+    case CMPI_uint16:
+      return std::uint64_t{data.value.uint16};
+    case CMPI_uint32:
+      return std::uint64_t{data.value.uint32};
+    case CMPI_uint64:
+      return std::uint64_t{data.value.uint64};
+    case CMPI_sint8:
+      return std::int64_t{data.value.sint8};
+    case CMPI_sint16:
+      return std::int64_t{data.value.sint16};
+    case CMPI_sint32:
+      return std::int64_t{data.value.sint32};
+    case CMPI_sint64:
+      return std::int64_t{data.value.sint64};
+    case CMPI_real32:
+      return double{data.value.real32};
+    case CMPI_real64:
+      return data.value.real64;
+    default:
+      return objectScalar(data);
+  }
+}
+
+Value valueOf(const CMPIData& data) {
+  if (cimom::isNull(data) || (data.type & CMPI_ARRAY) == 0) {
+    return scalarOf(data);
+  }
+  std::vector<Scalar> values;
+  for (const CMPIData& element : cimom::elements(data)) {
+    values.push_back(scalarOf(element));
+  }
+  return values;
+}
+
+[[noreturn]] void noSuchProperty(const cimom::ClassInfo& info, const std::string& name) {
+  std::vector<std::string> known;
+  for (const auto& property : info.properties) {
+    known.push_back(property.name);
+  }
+  const auto nearest = nearestName(name, known);
+  throw CommandError(statusName(CMPI_RC_ERR_NO_SUCH_PROPERTY) + ": " + info.name() + " has no property '" +
+                     name + "'" + (nearest ? "; did you mean " + *nearest + "?" : ""));
+}
+
+/// Members of JSON objects keep the order of the MOF, whatever was asked for first.
+Columns inOrderOf(const cimom::ClassInfo& info, Columns columns) {
+  std::stable_sort(columns.begin(), columns.end(), [&info](const Column& left, const Column& right) {
+    return info.property(left.name) < info.property(right.name);
+  });
+  return columns;
+}
+
+}  // namespace
+
+Columns allColumns(const cimom::ClassInfo& info) {
+  Columns columns;
+  for (const auto& property : info.properties) {
+    columns.push_back(columnOf(property));
+  }
+  return columns;
+}
+
+Columns namedColumns(const cimom::ClassInfo& info, const std::vector<std::string>& names) {
+  Columns columns;
+  for (const std::string& name : names) {
+    const cimom::mof::Property* property = info.property(name);
+    if (property == nullptr) {
+      noSuchProperty(info, name);
+    }
+    const bool known = std::any_of(columns.begin(), columns.end(), [property](const Column& column) {
+      return column.name == property->name;
+    });
+    if (!known) {
+      columns.push_back(columnOf(*property));
+    }
+  }
+  return columns;
+}
+
+Columns tellingColumns(const cimom::ClassInfo& info) {
+  Columns columns;
+  if (info.property("InstanceID") != nullptr && info.property("VersionString") != nullptr) {
+    for (const auto& [name, dropRank] : tellingProperties) {
+      if (const cimom::mof::Property* property = info.property(name)) {
+        columns.push_back(columnOf(*property));
+        columns.back().dropRank = dropRank;
+      }
+    }
+    return columns;
+  }
+  columns = allColumns(info);
+  std::stable_partition(columns.begin(), columns.end(),
+                        [&info](const Column& column) { return info.property(column.name)->key; });
+  return columns;
+}
+
+Columns chosenColumns(const cimom::ClassInfo& info, const Options& options) {
+  if (!options.properties.empty()) {
+    Columns named = namedColumns(info, options.properties);
+    return options.format == Format::Json ? inOrderOf(info, named) : named;
+  }
+  const bool brief = options.format == Format::Table && options.command == Command::List;
+  return brief ? tellingColumns(info) : allColumns(info);
+}
+
+Columns nameColumns(const cimom::ClassInfo& info) {
+  Columns columns{{"@path"}};
+  for (const std::size_t key : info.keys) {
+    columns.push_back(columnOf(info.properties[key]));
+  }
+  return columns;
+}
+
+std::optional<std::vector<std::string>> wantedProperties(const cimom::ClassInfo& info,
+                                                         const Columns& columns) {
+  if (columns.size() == info.properties.size()) {
+    return std::nullopt;
+  }
+  std::vector<std::string> names;
+  for (const Column& column : columns) {
+    names.push_back(column.name);
+  }
+  return names;
+}
+
+Row rowOf(const cimom::Instance& instance, const Columns& columns) {
+  Row row;
+  row.reserve(columns.size());
+  for (const Column& column : columns) {
+    const cimom::NamedValue* property = instance.find(column.name);
+    row.push_back(property == nullptr ? Value() : valueOf(property->data));
+  }
+  return row;
+}
+
+Row rowOf(const cimom::ObjectPath& path, const Columns& columns) {
+  Row row{Scalar(Reference{cimom::formatWbemUri(path)})};
+  for (std::size_t i = 1; i < columns.size(); ++i) {
+    const cimom::NamedValue* key = path.find(columns[i].name);
+    row.push_back(key == nullptr ? Value() : valueOf(key->data));
+  }
+  return row;
+}
+
+}  // namespace cli

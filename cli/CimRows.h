@@ -1,0 +1,42 @@
+// The host's objects as rows.
+#pragma once
+
+#include <cimom/broker/Objects.h>
+#include <cimom/mof/ClassRepository.h>
+#include <cli/Options.h>
+#include <cli/Row.h>
+
+#include <optional>
+#include <string>
+#include <vector>
+
+namespace cli {
+
+/// A column for each property of the class, in the order of the MOF.
+Columns allColumns(const cimom::ClassInfo& info);
+
+/// The named properties, each once, in the order given. Throws `CommandError` (CIM_ERR_NO_SUCH_PROPERTY) for
+/// a name that the class lacks.
+Columns namedColumns(const cimom::ClassInfo& info, const std::vector<std::string>& names);
+
+/// What a table shows unless told otherwise: of a software identity what tells it apart, of any other class
+/// its keys first, then the rest.
+Columns tellingColumns(const cimom::ClassInfo& info);
+
+/// The path, under a name that no property can have, then the keys.
+Columns nameColumns(const cimom::ClassInfo& info);
+
+/// The columns that the options ask for, or those that suit their format.
+Columns chosenColumns(const cimom::ClassInfo& info, const Options& options);
+
+/// The properties that the host is asked for: those of the columns, or none named where that is all of them.
+std::optional<std::vector<std::string>> wantedProperties(const cimom::ClassInfo& info,
+                                                         const Columns& columns);
+
+/// Properties that were not set, or set to null, are null.
+Row rowOf(const cimom::Instance& instance, const Columns& columns);
+
+/// For the columns of `nameColumns`.
+Row rowOf(const cimom::ObjectPath& path, const Columns& columns);
+
+}  // namespace cli

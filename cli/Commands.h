@@ -1,0 +1,16 @@
+// The commands. Each prints to `output` and throws `CommandError` where its request fails; what was printed
+// before is then whole in its format.
+#pragma once
+
+#include <cli/Options.h>
+#include <cli/Output.h>
+
+namespace cli {
+
+void runList(const Options& options, Output& output);
+void runNames(const Options& options, Output& output);
+void runGet(const Options& options, Output& output);
+void runTree(const Options& options, Output& output);
+void runCapture(const Options& options, Output& output);
+
+}  // namespace cli

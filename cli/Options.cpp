@@ -1,0 +1,225 @@
+#include <cli/HelpTexts.h>
+#include <cli/Options.h>
+#include <cli/Text.h>
+
+#include <CLI/CLI.hpp>
+#include <algorithm>
+#include <array>
+#include <memory>
+#include <stdexcept>
+#include <string_view>
+#include <utility>
+
+namespace cli {
+namespace {
+
+constexpr std::array<Command, 5> commands{Command::List, Command::Names, Command::Get, Command::Tree,
+                                          Command::Capture};
+
+/// A command line that makes no sense; the text says why.
+class UsageError : public std::runtime_error {
+ public:
+  using std::runtime_error::runtime_error;
+};
+
+/// The arguments as they were typed, before their values are looked at.
+struct Raw {
+  Options options;
+  std::string format;
+  std::string inventory;
+  std::string systemRoot;
+  std::string provider;
+  std::string logLevel;
+};
+
+/// The options stand in the program, and fall through to it from behind a command: they may stand anywhere.
+std::unique_ptr<CLI::App> makeParser(Raw& raw) {
+  auto app = std::make_unique<CLI::App>();
+  app->set_help_flag("-h,--help");
+  app->set_version_flag("--version", "swinv " SWINV_VERSION);
+  app->option_defaults()->multi_option_policy(CLI::MultiOptionPolicy::TakeLast);
+  app->add_option("--format", raw.format);
+  app->add_option("--inventory", raw.inventory);
+  app->add_option("--system-root", raw.systemRoot);
+  app->add_option("--provider", raw.provider);
+  app->add_option("--log-level", raw.logLevel);
+  app->add_flag("--force", raw.options.force);
+  app->add_option("--property", raw.options.properties)
+      ->delimiter(',')
+      ->allow_extra_args(false)
+      ->multi_option_policy(CLI::MultiOptionPolicy::TakeAll);
+  app->fallthrough();
+  app->require_subcommand(0, 1);
+  for (const Command command : commands) {
+    CLI::App* sub = app->add_subcommand(std::string(commandName(command)));
+    if (command == Command::List || command == Command::Names) {
+      sub->add_option("CLASS", raw.options.className);
+    } else if (command == Command::Get) {
+      sub->add_option("OBJECT", raw.options.object);
+    } else if (command == Command::Capture) {
+      sub->add_option("FILE", raw.options.captureFile);
+    }
+  }
+  return app;
+}
+
+std::optional<Command> commandOf(const CLI::App& app) {
+  const auto chosen = app.get_subcommands();
+  for (const Command command : commands) {
+    if (!chosen.empty() && chosen.front()->get_name() == commandName(command)) {
+      return command;
+    }
+  }
+  return std::nullopt;
+}
+
+template <typename Enum>
+Enum choice(const char* option, const std::string& value,
+            std::initializer_list<std::pair<std::string_view, Enum>> known) {
+  std::string names;
+  for (const auto& [name, meaning] : known) {
+    if (value == name) {
+      return meaning;
+    }
+    names.append(names.empty() ? "" : ", ").append(name);
+  }
+  throw UsageError(std::string(option) + " '" + value + "' is none of " + names);
+}
+
+/// An empty file name would silently mean "not set", and show another machine than was meant.
+std::optional<std::filesystem::path> fileOption(const CLI::App& app, const char* option,
+                                                const std::string& value) {
+  if (app.count(option) == 0) {
+    return std::nullopt;
+  }
+  if (value.empty()) {
+    throw UsageError(std::string(option) + " needs a name, and got an empty one");
+  }
+  return std::filesystem::path(value);
+}
+
+void checkThatOptionsApply(const CLI::App& app, Command command) {
+  struct Rule {
+    const char* option;
+    std::vector<Command> commands;
+  };
+  const std::array<Rule, 4> rules{
+      Rule{"--format", {Command::List, Command::Names, Command::Get, Command::Tree}},
+      Rule{"--property", {Command::List, Command::Get}},
+      Rule{"--provider", {Command::List, Command::Names, Command::Get}}, Rule{"--force", {Command::Capture}}};
+  for (const Rule& rule : rules) {
+    const auto& known = rule.commands;
+    if (app.count(rule.option) != 0 && std::find(known.begin(), known.end(), command) == known.end()) {
+      throw UsageError("'swinv " + std::string(commandName(command)) + "' takes no " + rule.option);
+    }
+  }
+  if (app.count("--inventory") != 0 && app.count("--system-root") != 0) {
+    throw UsageError("--inventory and --system-root name two machines; give one of them");
+  }
+}
+
+void checkArguments(const Options& options) {
+  if (options.command == Command::Get && options.object.empty()) {
+    throw UsageError("'swinv get' needs an InstanceID or an object path, as 'swinv names' prints them");
+  }
+  if (options.command == Command::Capture && options.captureFile.empty()) {
+    throw UsageError("'swinv capture' needs a file to write, or - for standard output");
+  }
+  if (options.className.empty()) {
+    throw UsageError("the name of the class is empty");
+  }
+  if (std::any_of(options.properties.begin(), options.properties.end(),
+                  [](const std::string& name) { return name.empty(); })) {
+    throw UsageError("--property has an empty name in its list");
+  }
+  if (options.command == Command::Tree && options.format == Format::Csv) {
+    throw UsageError("a tree has no csv form; 'swinv tree' knows --format table and json");
+  }
+}
+
+Options interpret(const CLI::App& app, Raw raw) {
+  const std::optional<Command> command = commandOf(app);
+  if (!command) {
+    throw UsageError("no command given; there are list, names, get, tree and capture");
+  }
+  checkThatOptionsApply(app, *command);
+  Options options = std::move(raw.options);
+  options.command = *command;
+  if (app.count("--format") != 0) {
+    options.format = choice<Format>("--format", raw.format,
+                                    {{"table", Format::Table}, {"json", Format::Json}, {"csv", Format::Csv}});
+  }
+  if (app.count("--log-level") != 0) {
+    options.logLevel =
+        choice<LogLevel>("--log-level", raw.logLevel,
+                         {{"off", LogLevel::Off}, {"error", LogLevel::Error}, {"trace", LogLevel::Trace}});
+  }
+  options.inventory = fileOption(app, "--inventory", raw.inventory);
+  options.systemRoot = fileOption(app, "--system-root", raw.systemRoot);
+  options.provider = fileOption(app, "--provider", raw.provider);
+  checkArguments(options);
+  return options;
+}
+
+CommandLine usageError(std::string_view what, std::optional<Command> command) {
+  const std::string help =
+      command ? "swinv " + std::string(commandName(*command)) + " --help" : std::string("swinv --help");
+  return {std::nullopt, 2, {}, std::string(what) + "\nTry '" + help + "'."};
+}
+
+/// What was typed in the place of a command, or beyond the arguments of one.
+std::string unexpected(const CLI::App& app) {
+  const std::vector<std::string> extras = app.remaining(true);
+  if (extras.empty()) {
+    return "an argument was not expected";
+  }
+  const std::string& first = extras.front();
+  if (first.size() > 1 && first.front() == '-') {
+    const auto nearest = nearestName(first.substr(0, first.find('=')), optionNames());
+    return "there is no option " + first + (nearest ? "; did you mean " + *nearest + "?" : "");
+  }
+  if (commandOf(app)) {
+    return "'" + first + "' is one argument too many";
+  }
+  std::vector<std::string> names;
+  for (const Command command : commands) {
+    names.emplace_back(commandName(command));
+  }
+  const auto nearest = nearestName(first, names);
+  return "there is no command '" + first + "'" + (nearest ? "; did you mean '" + *nearest + "'?" : "");
+}
+
+}  // namespace
+
+CommandLine parseCommandLine(std::vector<std::string> arguments) {
+  Raw raw;
+  const std::unique_ptr<CLI::App> app = makeParser(raw);
+  std::reverse(arguments.begin(), arguments.end());  // the parser takes them off the back
+  try {
+    app->parse(std::move(arguments));
+    return {interpret(*app, std::move(raw)), 0, {}, {}};
+  } catch (const CLI::CallForHelp&) {
+    return {std::nullopt, 0, std::string(helpText(commandOf(*app))), {}};
+  } catch (const CLI::CallForVersion&) {
+    return {std::nullopt, 0, "swinv " SWINV_VERSION "\n", {}};
+  } catch (const CLI::ExtrasError&) {
+    return usageError(unexpected(*app), commandOf(*app));
+  } catch (const CLI::ParseError& error) {
+    return usageError(error.what(), commandOf(*app));
+  } catch (const UsageError& error) {
+    return usageError(error.what(), commandOf(*app));
+  }
+}
+
+std::vector<std::string> optionNames() {
+  Raw raw;
+  std::vector<std::string> names;
+  for (const CLI::Option* option : makeParser(raw)->get_options()) {
+    for (const std::string& name : option->get_lnames()) {
+      names.push_back("--" + name);
+    }
+  }
+  return names;
+}
+
+}  // namespace cli

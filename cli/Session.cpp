@@ -1,0 +1,121 @@
+#include <cli/CimStatus.h>
+#include <cli/Layout.h>
+#include <cli/Messages.h>
+#include <cli/Session.h>
+#include <cli/Source.h>
+#include <cli/Text.h>
+
+#include <algorithm>
+#include <filesystem>
+#include <system_error>
+#include <vector>
+
+namespace cli {
+namespace {
+
+namespace fs = std::filesystem;
+
+/// The schema's files with this extension, by name.
+std::vector<fs::path> schemaFiles(const fs::path& folder, const char* extension) {
+  std::vector<fs::path> files;
+  std::error_code error;
+  for (fs::directory_iterator entry(folder, error), end; !error && entry != end; entry.increment(error)) {
+    if (entry->path().extension() == extension) {
+      files.push_back(entry->path());
+    }
+  }
+  if (error) {
+    throw CommandError("cannot read the schema folder " + folder.string() + ": " + error.message());
+  }
+  std::sort(files.begin(), files.end());
+  return files;
+}
+
+/// The part of the CIM schema first, which includes what it needs, then this system's own classes.
+std::vector<fs::path> mofFiles(const fs::path& folder) {
+  std::vector<fs::path> files{folder / "CIM_Core.mof"};
+  for (const fs::path& file : schemaFiles(folder, ".mof")) {
+    if (!file.filename().string().starts_with("CIM_")) {
+      files.push_back(file);
+    }
+  }
+  return files;
+}
+
+cimom::Configuration configure(const Options& options) {
+  const Layout layout = ownLayout();
+  cimom::Configuration configuration;
+  configuration.schema = mofFiles(layout.schema);
+  configuration.providerFolder = layout.libraries;
+  for (const fs::path& file : schemaFiles(layout.schema, ".reg")) {
+    for (cimom::ProviderRegistration& registration : cimom::readRegistrations(file)) {
+      configuration.providers.push_back(std::move(registration));
+    }
+  }
+  if (options.logLevel.value_or(LogLevel::Off) != LogLevel::Off) {
+    configuration.log = [](std::string_view line) { complain(line); };
+  }
+  return configuration;
+}
+
+std::string hintFor(CMPIrc code, bool logs) {
+  switch (code) {
+    case CMPI_RC_ERR_NOT_FOUND:
+      return "\n'swinv names' shows what there is.";
+    case CMPI_RC_ERR_FAILED:
+      return logs ? "" : "\n--log-level error shows what the provider has to say.";
+    default:
+      return {};
+  }
+}
+
+}  // namespace
+
+Session::Session(const Options& options)
+    : source_(checkedSource()), logs_(options.logLevel.value_or(LogLevel::Off) != LogLevel::Off) {
+  try {
+    manager_ = std::make_unique<cimom::ObjectManager>(configure(options));
+  } catch (const CommandError&) {
+    throw;
+  } catch (const std::exception& error) {
+    throw CommandError(std::string("the CIM schema cannot be used: ") + error.what());
+  }
+}
+
+const cimom::ClassInfo& Session::classNamed(const std::string& name) const {
+  const cimom::ClassInfo* info = manager_->classes().find(name);
+  if (info != nullptr) {
+    return *info;
+  }
+  std::vector<std::string> known;
+  for (const cimom::ClassInfo* other : manager_->classes().all()) {
+    known.push_back(other->name());
+  }
+  const auto nearest = nearestName(name, known);
+  throw CommandError(statusName(CMPI_RC_ERR_INVALID_CLASS) + ": the schema has no class '" + name + "'" +
+                     (nearest ? "; did you mean " + *nearest + "?" : ""));
+}
+
+void Session::conclude(const cimom::Outcome& outcome, const std::string& what, RowWriter& writer,
+                       Output& output) const {
+  const bool failed = outcome.status.code != CMPI_RC_OK;
+  if (!outcome.done && outcome.delivered == 0 && source_.inventory) {
+    // A provider cannot say why the framework had nothing for it; the file itself can.
+    static_cast<void>(readTreeOf(source_));
+  }
+  if (!failed || outcome.delivered > 0) {
+    writer.finish();
+    output.flush();
+  }
+  if (failed) {
+    const std::string& description = outcome.status.description;
+    throw CommandError(statusName(outcome.status.code) + ": " + what +
+                       (description.empty() ? "" : ": " + description) + hintFor(outcome.status.code, logs_));
+  }
+  if (!outcome.done) {
+    complain(logs_ ? "the provider stopped early; its log above says why"
+                   : "the provider stopped early; --log-level error shows why");
+  }
+}
+
+}  // namespace cli
