@@ -31,9 +31,9 @@ struct _CMPIBrokerEncFT {
                              const CMPIErrorSeverity, const CMPIErrorProbableCause, const CMPIrc,
                              CMPIStatus*);
   CMPIStatus (*openMessageFile)(const CMPIBroker*, const char*, CMPIMsgFileHandle*);
-  CMPIStatus (*closeMessageFile)(const CMPIBroker*, const CMPIMsgFileHandle);
-  CMPIString* (*getMessage2)(const CMPIBroker*, const char*, const CMPIMsgFileHandle, const char*,
-                             CMPIStatus*, CMPICount, ...);
+  CMPIStatus (*closeMessageFile)(const CMPIBroker*, CMPIMsgFileHandle);
+  CMPIString* (*getMessage2)(const CMPIBroker*, const char*, CMPIMsgFileHandle, const char*, CMPIStatus*,
+                             CMPICount, ...);
 };
 
 struct _CMPIBrokerFT {
