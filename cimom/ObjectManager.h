@@ -5,6 +5,7 @@
 // about. Threads: requests may be made from several threads at once.
 #pragma once
 
+#include <cimom/Outcome.h>
 #include <cimom/ProviderRegistration.h>
 #include <cimom/broker/Objects.h>
 #include <cimom/mof/ClassRepository.h>
@@ -19,21 +20,6 @@
 #include <vector>
 
 namespace cimom {
-
-/// A CIM status with its description, empty where there is nothing to add.
-struct Status {
-  CMPIrc code = CMPI_RC_OK;
-  std::string description;
-};
-
-/// How a request ended. What was delivered before stays delivered, whatever this says.
-struct Outcome {
-  Status status;
-  /// The provider sent the done marker. False after an OK means: it stopped early, for a reason in its own
-  /// log.
-  bool done = false;
-  std::size_t delivered = 0;  ///< objects handed to the sink
-};
 
 struct Configuration {
   std::vector<std::filesystem::path> schema;    ///< MOF files, in the order in which they are compiled
@@ -52,8 +38,10 @@ using PropertyList = std::optional<std::vector<std::string>>;
 
 class ObjectManager {
  public:
-  /// Reads the schema. Throws `MofError` (file, line, what was expected) or `std::runtime_error`. Providers
-  /// are loaded when a request first needs them; `tzset` is called once before.
+  /// Reads the schema. Throws `MofError` (file, line, what was expected), or `std::runtime_error` where a
+  /// registered class is not in the schema or is registered twice in a namespace. Providers are loaded when a
+  /// request first needs them; `tzset` is called once before. They are cleaned up and unloaded with the
+  /// object manager, when no request may be under way.
   explicit ObjectManager(Configuration configuration);
   ~ObjectManager();
   ObjectManager(const ObjectManager&) = delete;
@@ -61,17 +49,25 @@ class ObjectManager {
 
   [[nodiscard]] const ClassRepository& classes() const;
 
-  /// CMPI_RC_ERR_INVALID_CLASS for a class that the schema lacks, CMPI_RC_ERR_NOT_SUPPORTED for one without a
-  /// provider, CMPI_RC_ERR_FAILED where the provider's library cannot be loaded (the description says why).
+  /// The broker's view of the classes, for whoever parses paths (`parseWbemUri`).
+  [[nodiscard]] const ClassTable& classTable() const;
+
+  /// Instances of the class and of all classes below it, each once and at once as it comes from a provider.
+  /// An empty namespace is the one that the class is registered in. Of a property list, keys are always
+  /// delivered, and names that are no properties mean nothing.
+  ///
+  /// CMPI_RC_ERR_INVALID_NAMESPACE for a namespace in which nothing is registered, CMPI_RC_ERR_INVALID_CLASS
+  /// for a class that the schema lacks, CMPI_RC_ERR_NOT_SUPPORTED for one without a provider,
+  /// CMPI_RC_ERR_FAILED where the provider's library cannot be loaded (the description says why), else the
+  /// provider's own status. What a sink throws is thrown here.
   Outcome enumerateInstances(std::string_view nameSpace, std::string_view className,
                              const PropertyList& properties, const InstanceSink& sink);
   Outcome enumerateInstanceNames(std::string_view nameSpace, std::string_view className,
                                  const PathSink& sink);
 
-  /// One instance or a status: CMPI_RC_ERR_INVALID_PARAMETER where keys do not fit the class,
-  /// CMPI_RC_ERR_NOT_FOUND where the provider's answer is none, more than one, or one with other keys. `path`
-  /// is a WBEM URI text
-  /// (`formatWbemUri`), with or without the namespace.
+  /// One instance or a status: as above, and CMPI_RC_ERR_INVALID_PARAMETER where the text is no path or its
+  /// keys do not fit the class, CMPI_RC_ERR_NOT_FOUND where the provider's answer is none, more than one, or
+  /// one with other keys. `path` is a WBEM URI text (`formatWbemUri`), with or without the namespace.
   Outcome getInstance(std::string_view path, const PropertyList& properties, const InstanceSink& sink);
 
  private:

@@ -1,0 +1,69 @@
+// Which provider a request goes to: registrations, resolved against the classes once.
+#pragma once
+
+#include <cimom/ProviderLibrary.h>
+#include <cimom/ProviderRegistration.h>
+#include <cimom/broker/ClassTable.h>
+#include <cimom/mof/ClassRepository.h>
+
+#include <filesystem>
+#include <functional>
+#include <map>
+#include <memory>
+#include <span>
+#include <string>
+#include <string_view>
+#include <unordered_map>
+#include <utility>
+#include <vector>
+
+namespace cimom {
+
+/// One class and who serves it.
+struct Route {
+  const ClassInfo* info = nullptr;
+  bool instance = false;
+  bool association = false;
+  ProviderLibrary* library = nullptr;
+};
+
+/// Immutable once made, so that any number of threads may read it.
+class Routes {
+ public:
+  /// Throws `std::runtime_error` for a registration of a class that the schema lacks, and for two of one
+  /// class in one namespace. No library is loaded yet.
+  Routes(const ClassRepository& schema, const Broker& broker,
+         const std::vector<ProviderRegistration>& registrations, const std::filesystem::path& providerFolder,
+         const std::function<void(std::string_view)>& log);
+
+  [[nodiscard]] bool knowsNameSpace(std::string_view nameSpace) const;
+
+  /// The namespace that is meant where none is given: the first one that the class is registered in, else the
+  /// first of all; empty where nothing is registered.
+  [[nodiscard]] std::string_view defaultNameSpace(std::string_view className) const;
+
+  /// The provider registered for this very class, or nullptr.
+  [[nodiscard]] const Route* find(std::string_view nameSpace, const ClassInfo& info) const;
+
+  /// Those of the class and of every class below it, superclasses first.
+  [[nodiscard]] std::vector<const Route*> below(std::string_view nameSpace, const ClassInfo& top) const;
+
+  /// The provider that answers for instances of this class: its own, or that of the nearest ancestor that has
+  /// one. nullptr: none.
+  [[nodiscard]] const Route* responsible(std::string_view nameSpace, const ClassInfo& info) const;
+
+ private:
+  using ByClass = std::unordered_map<const ClassInfo*, Route>;
+
+  [[nodiscard]] const ByClass* inNameSpace(std::string_view nameSpace) const;
+  ProviderLibrary& library(const ProviderRegistration& registration, const Broker& broker,
+                           const std::filesystem::path& folder,
+                           const std::function<void(std::string_view)>& log);
+
+  const ClassRepository& schema_;
+  const ClassTable& classes_;
+  std::map<std::pair<std::string, std::string>, std::unique_ptr<ProviderLibrary>> libraries_;
+  std::vector<std::pair<std::string, ByClass>> nameSpaces_;  ///< few: in the order of registration
+};
+
+}  // namespace cimom
