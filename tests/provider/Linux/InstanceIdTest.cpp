@@ -1,0 +1,45 @@
+#include <Linux/InstanceId.h>
+#include <gtest/gtest.h>
+
+namespace {
+
+using Oru::SoftwareInventoryProfileProvider::makeInstanceId;
+using Oru::SoftwareInventoryProfileProvider::parentPathText;
+using Oru::SoftwareInventoryProfileProvider::parseInstanceId;
+
+TEST(InstanceId, IsTheParentsNumberInDecimalAndTheNodesText) {
+  EXPECT_EQ(makeInstanceId("1a", "xyz"), "26@xyz");
+  EXPECT_EQ(makeInstanceId("FFFFFFFFFFFFFFFF", "f"), "18446744073709551615@f");
+  EXPECT_EQ(makeInstanceId("0001a", "01"), "26@01");
+}
+
+TEST(InstanceId, AParentTextWithoutHexadecimalDigitsCountsAsZero) {
+  EXPECT_EQ(makeInstanceId("", "f"), "0@f");
+  EXPECT_EQ(makeInstanceId("xyz", "f"), "0@f");
+  EXPECT_EQ(makeInstanceId("1ag", "f"), "26@f") << "reading stops at the first other character";
+}
+
+TEST(InstanceId, IsReadBack) {
+  EXPECT_EQ(parseInstanceId("26@xyz").parent, 26U);
+  EXPECT_EQ(parseInstanceId("26@xyz").pathText, "xyz");
+  EXPECT_EQ(parseInstanceId(" 26 @ xyz more").pathText, "xyz");
+  EXPECT_EQ(parseInstanceId("26#xyz").pathText, "xyz") << "any one character separates";
+}
+
+TEST(InstanceId, AfterAFailureNothingMoreIsRead) {
+  EXPECT_EQ(parseInstanceId("12@").pathText, "");
+  EXPECT_EQ(parseInstanceId("12").pathText, "");
+  EXPECT_EQ(parseInstanceId("@xyz").pathText, "");
+  EXPECT_EQ(parseInstanceId("99999999999999999999@xyz").parent, ~std::uint64_t{0});
+  EXPECT_EQ(parseInstanceId("99999999999999999999@xyz").pathText, "");
+}
+
+TEST(InstanceId, ItsNumberIsTheParentsPathText) {
+  EXPECT_EQ(parentPathText("26@xyz"), "1a");
+  EXPECT_EQ(parentPathText("26"), "1a");
+  EXPECT_EQ(parentPathText("other"), "0");
+  EXPECT_EQ(parentPathText(""), "0");
+  EXPECT_EQ(parentPathText("-1"), "ffffffffffffffff");
+}
+
+}  // namespace
