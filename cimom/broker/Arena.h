@@ -11,11 +11,26 @@
 #include <type_traits>
 #include <utility>
 
+#if defined(__SANITIZE_ADDRESS__)
+#define CIMOM_ARENA_POISON 1
+#elif defined(__has_feature)
+#if __has_feature(address_sanitizer)
+#define CIMOM_ARENA_POISON 1
+#endif
+#endif
+#ifdef CIMOM_ARENA_POISON
+#include <sanitizer/asan_interface.h>
+#endif
+
 namespace cimom {
 
 class Arena {
  public:
-  Arena() = default;
+  /// For the many objects of a request; `small` for a single one.
+  static constexpr std::size_t usual = 16384;
+  static constexpr std::size_t small = 256;
+
+  explicit Arena(std::size_t firstChunk = usual) : chunkSize_(firstChunk) {}
   ~Arena();
   Arena(const Arena&) = delete;
   Arena& operator=(const Arena&) = delete;
@@ -69,13 +84,23 @@ class Arena {
   struct Chunk;
 
   void* allocateFromNewChunk(std::size_t size);
-  void dropChunks(Chunk* kept);
-  static void unpoison(const void* start, std::size_t size);
+  void freeChunks(Chunk* from);
+  static void unpoison([[maybe_unused]] const void* start, [[maybe_unused]] std::size_t size) {
+#ifdef CIMOM_ARENA_POISON
+    ASAN_UNPOISON_MEMORY_REGION(start, size);
+#endif
+  }
+  static void poison([[maybe_unused]] const void* start, [[maybe_unused]] std::size_t size) {
+#ifdef CIMOM_ARENA_POISON
+    ASAN_POISON_MEMORY_REGION(start, size);
+#endif
+  }
 
   char* next_ = nullptr;
   char* end_ = nullptr;
   Chunk* chunks_ = nullptr;  // the newest first
   std::size_t footprint_ = 0;
+  std::size_t chunkSize_;
 };
 
 }  // namespace cimom

@@ -84,7 +84,6 @@ struct BrokerSettings {
   std::string name = "cimom";
   UpcallTarget* upcalls = nullptr;           ///< null: every upcall answers CMPI_RC_ERR_NOT_SUPPORTED
   std::function<void(const LogEntry&)> log;  ///< empty: none; may be called from several threads at once
-  std::string providerFolder;                ///< what `resolveFileName` puts before library names
 };
 
 class Broker {
@@ -95,13 +94,14 @@ class Broker {
   Broker(const Broker&) = delete;
   Broker& operator=(const Broker&) = delete;
 
-  /// What a provider's factory is given.
+  /// What a provider's factory is given. A copy with fewer tables, or with tables of one's own, works as
+  /// well: the functions need `hdl` alone.
   [[nodiscard]] const CMPIBroker* handle() const;
   [[nodiscard]] const ClassTable& classes() const;
 
- private:
-  friend class BrokerCalls;
   struct State;
+
+ private:
   std::unique_ptr<State> state_;
 };
 

@@ -3,6 +3,7 @@
 // Immutable after construction: any number of threads may read it.
 #pragma once
 
+#include <cimom/Names.h>
 #include <cimom/broker/ClassModel.h>
 #include <cmpi/cmpidt.h>
 
@@ -20,10 +21,6 @@ class Arena;
 class String;
 class ClassInfo;
 
-/// CIM compares names without regard to the case of ASCII letters.
-[[nodiscard]] bool sameName(std::string_view left, std::string_view right);
-[[nodiscard]] std::uint32_t nameHash(std::string_view name);
-
 /// Finds one of a fixed list of names, whatever their case.
 class NameIndex {
  public:
@@ -34,6 +31,8 @@ class NameIndex {
   [[nodiscard]] std::size_t find(std::string_view name) const;
 
  private:
+  [[nodiscard]] static std::size_t hash(std::string_view name);
+
   std::vector<std::string_view> names_;
   std::vector<std::uint32_t> slots_;  // open addressing: position in names_ + 1, 0 for free
 };
@@ -87,6 +86,7 @@ class ClassTable {
  private:
   void fill(ClassInfo& info, const ClassDeclaration& declaration);
   void connect(const std::vector<ClassDeclaration>& declarations);
+  void checkAncestry() const;
 
   std::unique_ptr<Arena> arena_;
   std::vector<std::unique_ptr<ClassInfo>> classes_;

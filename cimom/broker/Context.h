@@ -18,7 +18,9 @@ class NamedValues {
 
   [[nodiscard]] std::span<const NamedValue> all() const { return {values_, count_}; }
   [[nodiscard]] const NamedValue* find(std::string_view name) const;
-  /// Replaces a value of the same name. Status as `ObjectPath::addKey`, but any CMPI type of a value will do.
+  /// Replaces a value of the same name. CMPI_RC_ERR_INVALID_DATA_TYPE for a type that
+  /// no property could have, CMPI_RC_ERR_INVALID_PARAMETER for an empty name, CMPI_RC_ERR_INVALID_HANDLE for
+  /// a foreign object.
   CMPIrc set(std::string_view name, const CMPIValue* value, CMPIType type);
   void copyFrom(const NamedValues& other);
   [[nodiscard]] Arena* arena() const { return arena_; }

@@ -53,18 +53,24 @@ struct NamedValue {
 class String final : public CMPIString {
  public:
   static String* create(Arena& arena, std::string_view text);
+  /// One that nothing copies, because its arena outlives all others: the names in a `ClassTable`.
+  static String* createShared(Arena& arena, std::string_view text);
   /// Null where `handle` is null or not an object of this broker; so for each class below.
   static String* from(const CMPIString* handle);
 
   [[nodiscard]] std::string_view view() const { return {reinterpret_cast<const char*>(this + 1), size_}; }
+  /// This string where it lives in `arena` or is shared, else a copy there.
+  [[nodiscard]] String* in(Arena& arena) const;
+  [[nodiscard]] String* copyTo(Arena& arena) const;
   [[nodiscard]] Arena* arena() const { return arena_; }
 
  private:
   friend class Arena;
   friend struct Ownership;
-  String(Arena& arena, std::size_t size);
+  String(Arena* arena, std::size_t size);
+  static String* place(Arena& arena, std::string_view text, Arena* owner);
 
-  Arena* arena_;
+  Arena* arena_;  // null: shared
   std::size_t size_;
   bool ownsArena_ = false;
 };
@@ -83,6 +89,9 @@ class DateTime final : public CMPIDateTime {
   [[nodiscard]] bool isInterval() const { return text_[21] == ':'; }
   /// None for a time before 1970; asterisks count as the lowest value of their field.
   [[nodiscard]] std::optional<std::uint64_t> microseconds() const;
+  /// This datetime where it lives in `arena`, else a copy there.
+  [[nodiscard]] DateTime* in(Arena& arena) const;
+  [[nodiscard]] DateTime* copyTo(Arena& arena) const;
   [[nodiscard]] Arena* arena() const { return arena_; }
 
  private:
@@ -157,8 +166,7 @@ class ObjectPath final : public CMPIObjectPath {
   friend struct Ownership;
   friend class ObjectPathCalls;
   ObjectPath(Arena& arena, const ClassTable& classes);
-  ObjectPath(const ObjectPath&) = default;
-  NamedValue* slotFor(std::string_view name);
+  void makeRoom(std::uint32_t count);
 
   Arena* arena_;
   const ClassTable* classes_;
@@ -168,7 +176,7 @@ class ObjectPath final : public CMPIObjectPath {
   String* hostName_ = nullptr;
   NamedValue* keys_ = nullptr;
   std::uint32_t keyCount_ = 0;
-  std::uint32_t keyCapacity_ = 0;  // 0 also while the keys are shared with another path: a change copies them
+  mutable std::uint32_t keyCapacity_ = 0;  // 0 also while another path shares the keys: a change copies them
   bool ownsArena_ = false;
 };
 

@@ -30,6 +30,9 @@ class Request {
   /// For what the provider makes. The innermost mark's, where the provider has set marks.
   [[nodiscard]] Arena& arena() { return marks_.empty() ? made_ : *marks_.back(); }
 
+  /// Whether `arena` is one of this request's.
+  [[nodiscard]] bool owns(const Arena& arena) const;
+
   /// Takes back what the provider has made so far, `held()` excepted. For providers that keep nothing of what
   /// they have returned. Does nothing while a mark is set.
   void recycle();
@@ -40,8 +43,6 @@ class Request {
   bool release(const void* mark);
 
  private:
-  friend class RequestScope;
-
   Arena held_;
   Arena made_;
   std::vector<std::unique_ptr<Arena>> marks_;

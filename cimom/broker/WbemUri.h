@@ -19,6 +19,9 @@
 
 namespace cimom {
 
+/// How deep references may be nested in each other.
+inline constexpr unsigned wbemUriDepth = 8;
+
 /// What is wrong with a text: `what()` names the column (the first is 1) and what was expected there.
 class WbemUriError : public std::runtime_error {
  public:
@@ -30,10 +33,11 @@ class WbemUriError : public std::runtime_error {
 };
 
 /// With host and namespace where the path has them; keys in their order. `parseWbemUri` gives the same path.
+/// References nested deeper than `wbemUriDepth` lose their keys.
 [[nodiscard]] std::string formatWbemUri(const ObjectPath& path);
 
 /// A path in `arena`. `defaultNameSpace` is for texts without one. Throws `WbemUriError`; also for text
-/// beyond 64 KiB and for references nested deeper than 8.
+/// beyond 64 KiB and for references nested deeper than `wbemUriDepth`.
 ObjectPath* parseWbemUri(Arena& arena, const ClassTable& classes, std::string_view text,
                          std::string_view defaultNameSpace = {});
 
