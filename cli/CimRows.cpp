@@ -137,7 +137,7 @@ Value valueOf(const CMPIData& data) {
   return values;
 }
 
-[[noreturn]] void noSuchProperty(const cimom::ClassInfo& info, const std::string& name) {
+[[noreturn]] void noSuchProperty(const cimom::SchemaClass& info, const std::string& name) {
   std::vector<std::string> known;
   for (const auto& property : info.properties) {
     known.push_back(property.name);
@@ -148,7 +148,7 @@ Value valueOf(const CMPIData& data) {
 }
 
 /// Members of JSON objects keep the order of the MOF, whatever was asked for first.
-Columns inOrderOf(const cimom::ClassInfo& info, Columns columns) {
+Columns inOrderOf(const cimom::SchemaClass& info, Columns columns) {
   std::stable_sort(columns.begin(), columns.end(), [&info](const Column& left, const Column& right) {
     return info.property(left.name) < info.property(right.name);
   });
@@ -157,7 +157,7 @@ Columns inOrderOf(const cimom::ClassInfo& info, Columns columns) {
 
 }  // namespace
 
-Columns allColumns(const cimom::ClassInfo& info) {
+Columns allColumns(const cimom::SchemaClass& info) {
   Columns columns;
   for (const auto& property : info.properties) {
     columns.push_back(columnOf(property));
@@ -165,7 +165,7 @@ Columns allColumns(const cimom::ClassInfo& info) {
   return columns;
 }
 
-Columns namedColumns(const cimom::ClassInfo& info, const std::vector<std::string>& names) {
+Columns namedColumns(const cimom::SchemaClass& info, const std::vector<std::string>& names) {
   Columns columns;
   for (const std::string& name : names) {
     const cimom::mof::Property* property = info.property(name);
@@ -182,7 +182,7 @@ Columns namedColumns(const cimom::ClassInfo& info, const std::vector<std::string
   return columns;
 }
 
-Columns tellingColumns(const cimom::ClassInfo& info) {
+Columns tellingColumns(const cimom::SchemaClass& info) {
   Columns columns;
   if (info.property("InstanceID") != nullptr && info.property("VersionString") != nullptr) {
     for (const auto& [name, dropRank] : tellingProperties) {
@@ -199,7 +199,7 @@ Columns tellingColumns(const cimom::ClassInfo& info) {
   return columns;
 }
 
-Columns chosenColumns(const cimom::ClassInfo& info, const Options& options) {
+Columns chosenColumns(const cimom::SchemaClass& info, const Options& options) {
   if (!options.properties.empty()) {
     Columns named = namedColumns(info, options.properties);
     return options.format == Format::Json ? inOrderOf(info, named) : named;
@@ -208,15 +208,15 @@ Columns chosenColumns(const cimom::ClassInfo& info, const Options& options) {
   return brief ? tellingColumns(info) : allColumns(info);
 }
 
-Columns nameColumns(const cimom::ClassInfo& info) {
+Columns nameColumns(const cimom::SchemaClass& info) {
   Columns columns{{"@path"}};
-  for (const std::size_t key : info.keys) {
-    columns.push_back(columnOf(info.properties[key]));
+  for (const cimom::mof::Property* key : info.keys()) {
+    columns.push_back(columnOf(*key));
   }
   return columns;
 }
 
-std::optional<std::vector<std::string>> wantedProperties(const cimom::ClassInfo& info,
+std::optional<std::vector<std::string>> wantedProperties(const cimom::SchemaClass& info,
                                                          const Columns& columns) {
   if (columns.size() == info.properties.size()) {
     return std::nullopt;

@@ -13,24 +13,24 @@
 namespace cli {
 
 /// A column for each property of the class, in the order of the MOF.
-Columns allColumns(const cimom::ClassInfo& info);
+Columns allColumns(const cimom::SchemaClass& info);
 
 /// The named properties, each once, in the order given. Throws `CommandError` (CIM_ERR_NO_SUCH_PROPERTY) for
 /// a name that the class lacks.
-Columns namedColumns(const cimom::ClassInfo& info, const std::vector<std::string>& names);
+Columns namedColumns(const cimom::SchemaClass& info, const std::vector<std::string>& names);
 
 /// What a table shows unless told otherwise: of a software identity what tells it apart, of any other class
 /// its keys first, then the rest.
-Columns tellingColumns(const cimom::ClassInfo& info);
+Columns tellingColumns(const cimom::SchemaClass& info);
 
 /// The path, under a name that no property can have, then the keys.
-Columns nameColumns(const cimom::ClassInfo& info);
+Columns nameColumns(const cimom::SchemaClass& info);
 
 /// The columns that the options ask for, or those that suit their format.
-Columns chosenColumns(const cimom::ClassInfo& info, const Options& options);
+Columns chosenColumns(const cimom::SchemaClass& info, const Options& options);
 
 /// The properties that the host is asked for: those of the columns, or none named where that is all of them.
-std::optional<std::vector<std::string>> wantedProperties(const cimom::ClassInfo& info,
+std::optional<std::vector<std::string>> wantedProperties(const cimom::SchemaClass& info,
                                                          const Columns& columns);
 
 /// Properties that were not set, or set to null, are null.

@@ -38,7 +38,7 @@ std::string classOf(const std::string& path) {
 void runGet(const Options& options, Output& output) {
   Session session(options);
   const std::string path = pathOf(options);
-  const cimom::ClassInfo& info = session.classNamed(classOf(path));
+  const cimom::SchemaClass& info = session.classNamed(classOf(path));
   const Columns columns = chosenColumns(info, options);
   const auto writer = makeWriter(options.format, columns, {false, true}, output);
   Progress progress("Asking for " + options.object);

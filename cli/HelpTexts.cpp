@@ -4,27 +4,29 @@ namespace cli {
 namespace {
 
 constexpr std::string_view programHelp =
-    R"(swinv - the software and firmware of this machine, as a CIM object manager shows it
+    R"(swinv - the software and firmware of this machine, asked through CIM
 
 Usage: swinv COMMAND [ARGUMENTS] [OPTIONS]
 
 Commands:
-  list [CLASS]     show all instances of a class (default: KELVO_SoftwareIdentity)
+  list [CLASS]     show the instances of a class (KELVO_SoftwareIdentity)
   names [CLASS]    show the object paths of all instances
   get OBJECT       show one instance, named by its InstanceID or its object path
   tree             show the tree of devices that the inventory is made of
   capture FILE     save that tree as an inventory file
 
 Options:
-  --format table|json|csv    how to print (default: table; tree knows table and json)
-  --property NAME[,NAME...]  list and get: show these properties, in this order; repeatable
-  --inventory FILE           show the machine that an inventory file describes
-  --system-root DIR          show the machine whose sys/, proc/ and lib/ are below DIR
-  --provider FILE            load this provider library instead of the installed one
-  --log-level off|error|trace  what the provider logs on standard error (default: off)
-  --force                    capture: replace an existing file
-  --version                  print the version and stop
-  --help, -h                 print this help; after a command, the help of that command
+  --format table|json|csv  how to print (default: table; tree has no csv)
+  --property NAME[,...]    list, get: these properties, in this order;
+                           repeatable
+  --inventory FILE         show the machine that an inventory file describes
+  --system-root DIR        show the machine whose sys/, proc/, lib/ are in DIR
+  --provider FILE          load this provider library, not the installed one
+  --log-level off|error|trace
+                           what the provider logs, on standard error (off)
+  --force                  capture: replace an existing file
+  --version                print the version and stop
+  --help, -h               print this help; after a command, that command's help
 
 Without --inventory and --system-root it is the live machine that is shown. No
 command needs root; what an ordinary user may not read is left out, and "swinv
@@ -48,18 +50,20 @@ constexpr std::string_view listHelp =
 
 Usage: swinv list [CLASS] [OPTIONS]
 
-CLASS is a class of the schema; without it, KELVO_SoftwareIdentity: each firmware,
-BIOS and driver of the machine.
+CLASS is a class of the schema; without it, KELVO_SoftwareIdentity: each
+firmware, BIOS and driver of the machine.
 
 Options:
-  --format table|json|csv    table (default): the most telling properties, cut to the
-                             width of the terminal; json: a list of objects with every
-                             property that has a value; csv: a column for every property
-  --property NAME[,NAME...]  these properties alone, in this order; repeatable
-  --inventory FILE           show the machine that an inventory file describes
-  --system-root DIR          show the machine whose sys/, proc/ and lib/ are below DIR
-  --provider FILE            load this provider library instead of the installed one
-  --log-level off|error|trace  what the provider logs on standard error (default: off)
+  --format table|json|csv  table (default): the most telling properties, cut to
+                           the width of the terminal; json: a list of objects
+                           with every property that has a value; csv: a column
+                           for every property
+  --property NAME[,...]    these properties alone, in this order; repeatable
+  --inventory FILE         show the machine that an inventory file describes
+  --system-root DIR        show the machine whose sys/, proc/, lib/ are in DIR
+  --provider FILE          load this provider library, not the installed one
+  --log-level off|error|trace
+                           what the provider logs, on standard error (off)
 
 Examples:
   swinv list
@@ -75,11 +79,12 @@ Usage: swinv names [CLASS] [OPTIONS]
 Prints one WBEM URI a line, as "swinv get" takes them.
 
 Options:
-  --format table|json|csv    json and csv also have the keys by name (default: table)
-  --inventory FILE           show the machine that an inventory file describes
-  --system-root DIR          show the machine whose sys/, proc/ and lib/ are below DIR
-  --provider FILE            load this provider library instead of the installed one
-  --log-level off|error|trace  what the provider logs on standard error (default: off)
+  --format table|json|csv  json and csv also have the keys (default: table)
+  --inventory FILE         show the machine that an inventory file describes
+  --system-root DIR        show the machine whose sys/, proc/, lib/ are in DIR
+  --provider FILE          load this provider library, not the installed one
+  --log-level off|error|trace
+                           what the provider logs, on standard error (off)
 
 Examples:
   swinv names
@@ -92,15 +97,17 @@ constexpr std::string_view getHelp =
 Usage: swinv get OBJECT [OPTIONS]
 
 OBJECT is the InstanceID of a KELVO_SoftwareIdentity, or the object path of an
-instance of any class, as "swinv names" prints them.
+instance of any class, as "swinv names" prints it.
 
 Options:
-  --format table|json|csv    table (default): a line for each property that has a value
-  --property NAME[,NAME...]  these properties alone, in this order; repeatable
-  --inventory FILE           show the machine that an inventory file describes
-  --system-root DIR          show the machine whose sys/, proc/ and lib/ are below DIR
-  --provider FILE            load this provider library instead of the installed one
-  --log-level off|error|trace  what the provider logs on standard error (default: off)
+  --format table|json|csv  table (default): a line for each property that has a
+                           value
+  --property NAME[,...]    these properties alone, in this order; repeatable
+  --inventory FILE         show the machine that an inventory file describes
+  --system-root DIR        show the machine whose sys/, proc/, lib/ are in DIR
+  --provider FILE          load this provider library, not the installed one
+  --log-level off|error|trace
+                           what the provider logs, on standard error (off)
 
 Examples:
   swinv get 1@3b2
@@ -112,16 +119,15 @@ constexpr std::string_view treeHelp =
 
 Usage: swinv tree [OPTIONS]
 
-A line for each node: its type, description, name and version, the devices that a
-driver drives, and in brackets the InstanceID of a software element, or the number
-that stands before the "@" in the InstanceIDs of the software below it. At the end
-stands what could not be read, and why.
+A line for each node: its type, description, name and version, the devices that
+a driver drives, and in brackets the InstanceID of a software element, or the
+number before the "@" in the InstanceIDs of the software directly below the
+node. At the end stands what could not be read, and why.
 
 Options:
-  --format table|json  json: the tree as an inventory file (default: table)
-  --inventory FILE     show the machine that an inventory file describes
-  --system-root DIR    show the machine whose sys/, proc/ and lib/ are below DIR
-  --log-level off|error|trace  accepted as everywhere; reading the tree logs nothing
+  --format table|json      json: the tree as an inventory file (default: table)
+  --inventory FILE         show the machine that an inventory file describes
+  --system-root DIR        show the machine whose sys/, proc/, lib/ are in DIR
 
 Examples:
   swinv tree
@@ -133,14 +139,13 @@ constexpr std::string_view captureHelp =
 
 Usage: swinv capture FILE [OPTIONS]
 
-The file can be shown anywhere with --inventory. It appears whole or not at all; an
-existing file is left alone. FILE "-" is standard output.
+The file can be shown anywhere with --inventory. It appears whole or not at all;
+an existing file is left alone. FILE "-" is standard output.
 
 Options:
-  --force              replace an existing file
-  --inventory FILE     save the machine that another inventory file describes
-  --system-root DIR    save the machine whose sys/, proc/ and lib/ are below DIR
-  --log-level off|error|trace  accepted as everywhere; reading the tree logs nothing
+  --force                  replace an existing file
+  --inventory FILE         save the machine of another inventory file
+  --system-root DIR        save the machine whose sys/, proc/, lib/ are in DIR
 
 Examples:
   swinv capture server.json

@@ -33,7 +33,6 @@ struct JsonOutput::Writer {
   void operator()(std::uint64_t value) { json.Uint64(value); }
   void operator()(std::int64_t value) { json.Int64(value); }
   void operator()(double value) {
-    // JSON has no number for infinities and what is no number.
     if (std::isfinite(value)) {
       json.Double(value);
     } else {
@@ -55,6 +54,17 @@ struct JsonOutput::Writer {
   }
 };
 
+namespace {
+
+/// JSON has no number for infinities and for what is no number: such a property has no value there.
+bool hasValue(const Value& value) {
+  const Scalar* scalar = std::get_if<Scalar>(&value);
+  const double* number = scalar == nullptr ? nullptr : std::get_if<double>(scalar);
+  return !isNull(value) && (number == nullptr || std::isfinite(*number));
+}
+
+}  // namespace
+
 JsonOutput::JsonOutput(Columns columns, Output& output)
     : columns_(std::move(columns)), output_(output), writer_(std::make_unique<Writer>()) {}
 
@@ -64,7 +74,7 @@ void JsonOutput::write(Row row) {
   writer_->start();
   writer_->json.StartObject();
   for (std::size_t i = 0; i < columns_.size(); ++i) {
-    if (!isNull(row[i])) {
+    if (hasValue(row[i])) {
       const std::string& name = columns_[i].name;
       writer_->json.Key(name.data(), static_cast<rapidjson::SizeType>(name.size()));
       std::visit(*writer_, row[i]);

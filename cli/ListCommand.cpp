@@ -8,7 +8,7 @@ namespace cli {
 
 void runList(const Options& options, Output& output) {
   Session session(options);
-  const cimom::ClassInfo& info = session.classNamed(options.className);
+  const cimom::SchemaClass& info = session.classNamed(options.className);
   const Columns columns = chosenColumns(info, options);
   const bool asked = !options.properties.empty();
   const auto writer = makeWriter(options.format, columns, {!asked, false}, output);

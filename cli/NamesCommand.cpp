@@ -35,7 +35,7 @@ class PathLines : public RowWriter {
 
 void runNames(const Options& options, Output& output) {
   Session session(options);
-  const cimom::ClassInfo& info = session.classNamed(options.className);
+  const cimom::SchemaClass& info = session.classNamed(options.className);
   const Columns columns = nameColumns(info);
   const std::unique_ptr<RowWriter> writer = options.format == Format::Table
                                                 ? std::make_unique<PathLines>(output)

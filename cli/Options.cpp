@@ -25,6 +25,7 @@ class UsageError : public std::runtime_error {
 /// The arguments as they were typed, before their values are looked at.
 struct Raw {
   Options options;
+  std::vector<std::string> properties;  ///< each a list
   std::string format;
   std::string inventory;
   std::string systemRoot;
@@ -44,8 +45,7 @@ std::unique_ptr<CLI::App> makeParser(Raw& raw) {
   app->add_option("--provider", raw.provider);
   app->add_option("--log-level", raw.logLevel);
   app->add_flag("--force", raw.options.force);
-  app->add_option("--property", raw.options.properties)
-      ->delimiter(',')
+  app->add_option("--property", raw.properties)
       ->allow_extra_args(false)
       ->multi_option_policy(CLI::MultiOptionPolicy::TakeAll);
   app->fallthrough();
@@ -137,6 +137,18 @@ void checkArguments(const Options& options) {
   }
 }
 
+std::vector<std::string> namesIn(const std::vector<std::string>& lists) {
+  std::vector<std::string> names;
+  for (const std::string& list : lists) {
+    for (std::size_t begin = 0; begin <= list.size();) {
+      const std::size_t end = std::min(list.find(',', begin), list.size());
+      names.push_back(list.substr(begin, end - begin));
+      begin = end + 1;
+    }
+  }
+  return names;
+}
+
 Options interpret(const CLI::App& app, Raw raw) {
   const std::optional<Command> command = commandOf(app);
   if (!command) {
@@ -154,6 +166,7 @@ Options interpret(const CLI::App& app, Raw raw) {
         choice<LogLevel>("--log-level", raw.logLevel,
                          {{"off", LogLevel::Off}, {"error", LogLevel::Error}, {"trace", LogLevel::Trace}});
   }
+  options.properties = namesIn(raw.properties);
   options.inventory = fileOption(app, "--inventory", raw.inventory);
   options.systemRoot = fileOption(app, "--system-root", raw.systemRoot);
   options.provider = fileOption(app, "--provider", raw.provider);
@@ -213,8 +226,9 @@ CommandLine parseCommandLine(std::vector<std::string> arguments) {
 
 std::vector<std::string> optionNames() {
   Raw raw;
+  const std::unique_ptr<CLI::App> app = makeParser(raw);
   std::vector<std::string> names;
-  for (const CLI::Option* option : makeParser(raw)->get_options()) {
+  for (const CLI::Option* option : app->get_options()) {
     for (const std::string& name : option->get_lnames()) {
       names.push_back("--" + name);
     }

@@ -8,12 +8,16 @@
 #include <algorithm>
 #include <filesystem>
 #include <system_error>
+#include <utility>
 #include <vector>
 
 namespace cli {
 namespace {
 
 namespace fs = std::filesystem;
+
+/// The library, by its name in registrations, whose place --provider takes.
+constexpr std::string_view inventoryProvider = "SoftwareInventoryProvider";
 
 /// The schema's files with this extension, by name.
 std::vector<fs::path> schemaFiles(const fs::path& folder, const char* extension) {
@@ -43,12 +47,20 @@ std::vector<fs::path> mofFiles(const fs::path& folder) {
 }
 
 cimom::Configuration configure(const Options& options) {
+  std::error_code error;
+  if (options.provider && !fs::exists(*options.provider, error)) {
+    throw CommandError("there is no provider library " + options.provider->string() +
+                       "; --provider takes the file that holds it");
+  }
   const Layout layout = ownLayout();
   cimom::Configuration configuration;
   configuration.schema = mofFiles(layout.schema);
   configuration.providerFolder = layout.libraries;
   for (const fs::path& file : schemaFiles(layout.schema, ".reg")) {
     for (cimom::ProviderRegistration& registration : cimom::readRegistrations(file)) {
+      if (options.provider && registration.location == inventoryProvider) {
+        registration.location = fs::absolute(*options.provider).string();
+      }
       configuration.providers.push_back(std::move(registration));
     }
   }
@@ -82,13 +94,13 @@ Session::Session(const Options& options)
   }
 }
 
-const cimom::ClassInfo& Session::classNamed(const std::string& name) const {
-  const cimom::ClassInfo* info = manager_->classes().find(name);
+const cimom::SchemaClass& Session::classNamed(const std::string& name) const {
+  const cimom::SchemaClass* info = manager_->classes().find(name);
   if (info != nullptr) {
     return *info;
   }
   std::vector<std::string> known;
-  for (const cimom::ClassInfo* other : manager_->classes().all()) {
+  for (const cimom::SchemaClass* other : manager_->classes().all()) {
     known.push_back(other->name());
   }
   const auto nearest = nearestName(name, known);

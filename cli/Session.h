@@ -24,7 +24,7 @@ class Session {
   cimom::ObjectManager& manager() { return *manager_; }
 
   /// Throws `CommandError` (CIM_ERR_INVALID_CLASS) for a class that the schema lacks.
-  [[nodiscard]] const cimom::ClassInfo& classNamed(const std::string& name) const;
+  [[nodiscard]] const cimom::SchemaClass& classNamed(const std::string& name) const;
 
   /// Ends a request: finishes the writer, and throws `CommandError` where the request failed or the inventory
   /// file turns out to be the reason for an empty answer. A provider that stopped early is told of on
