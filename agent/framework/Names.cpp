@@ -15,7 +15,7 @@ struct Name {
   std::string_view text;
 };
 
-constexpr std::array<Name, 7> nodeTypes{{
+constexpr std::array<Name, 8> nodeTypes{{
     {Oru::NodeLexicon::BiosNode, "Bios"},
     {Oru::NodeLexicon::FirmwareNode, "Firmware"},
     {Oru::NodeLexicon::NetworkPortNode, "NetworkPort"},
@@ -23,6 +23,7 @@ constexpr std::array<Name, 7> nodeTypes{{
     {Oru::NodeLexicon::ApplicationSoftwareNode, "ApplicationSoftware"},
     {Oru::NodeLexicon::DriverNode, "Driver"},
     {Oru::NodeLexicon::NetworkDeviceNode, "NetworkDevice"},
+    {DeviceNode, "Device"},
 }};
 
 constexpr std::array<Name, 11> properties{{

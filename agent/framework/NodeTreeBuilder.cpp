@@ -6,6 +6,15 @@
 #include <utility>
 
 namespace agent {
+namespace {
+
+void checkType(int type) {
+  if (type < 0) {
+    throw std::invalid_argument("a node's type must not be negative");
+  }
+}
+
+}  // namespace
 
 NodeTree::TextRange NodeTreeBuilder::keep(std::string_view text) {
   const std::string clean = cleanText(text);
@@ -26,6 +35,7 @@ NodeTreeBuilder::Handle NodeTreeBuilder::add(Handle parent, int type, std::strin
   if (drafts_.size() >= NodeTree::none) {
     throw std::length_error("a node tree has too many nodes");
   }
+  checkType(type);
   Draft draft;
   draft.parent = parent;
   drafts_.push_back(draft);
@@ -36,9 +46,7 @@ NodeTreeBuilder::Handle NodeTreeBuilder::add(Handle parent, int type, std::strin
 
 void NodeTreeBuilder::describe(Handle node, int type, std::string_view position,
                                std::string_view description) {
-  if (type < 0) {
-    throw std::invalid_argument("a node's type must not be negative");
-  }
+  checkType(type);
   Draft& draft = drafts_.at(node);
   draft.type = type;
   draft.position = keep(position);

@@ -6,9 +6,14 @@
 
 namespace agent {
 
+enum OwnNodeType : int {
+  DeviceNode = firstOwnNumber,  ///< a part that the contract has no type for (a drive, a processor), above
+                                ///< its firmware
+};
+
 enum OwnProperty : int {
   DrivenDevicesProperty =
-      firstOwnNumber,  ///< of a driver: the devices it drives, "BUS:ADDRESS", blanks between
+      firstOwnNumber,  ///< of a driver: the devices it drives, "BUS:ADDRESS", ", " between two
 };
 
 }  // namespace agent

@@ -1,0 +1,65 @@
+#include "TestSource.h"
+
+#include <agent/framework/TreeSource.h>
+
+#include <ZelLog/ZelLogger.h>
+
+#include <mutex>
+#include <utility>
+
+namespace {
+
+std::mutex mutex;
+std::function<agent::NodeTree()> currentSource;
+std::vector<agent::testing::LoggedMessage> logged;
+
+void log(bool isTrace, const std::string& category, int level, const std::string& message) {
+  const std::lock_guard lock(mutex);
+  logged.push_back({isTrace, category, level, message});
+}
+
+}  // namespace
+
+namespace agent {
+
+TreeSource TreeSource::fromEnvironment() {
+  return {};
+}
+
+NodeTree readTree(const TreeSource&) {
+  std::function<NodeTree()> source;
+  {
+    const std::lock_guard lock(mutex);
+    source = currentSource;
+  }
+  return source ? source() : NodeTree();
+}
+
+namespace testing {
+
+void setSource(std::function<NodeTree()> source) {
+  const std::lock_guard lock(mutex);
+  currentSource = std::move(source);
+}
+
+std::vector<LoggedMessage> takeLog() {
+  const std::lock_guard lock(mutex);
+  return std::exchange(logged, {});
+}
+
+}  // namespace testing
+}  // namespace agent
+
+namespace ZelLog {
+
+void ZelLogger::logLevelMessage(const char*, const char*, unsigned int, const std::string& category,
+                                int level, const char*, int, int, const std::string& message) {
+  log(false, category, level, message);
+}
+
+void ZelLogger::traceLevelMessage(const char*, const char*, unsigned int, const std::string& category,
+                                  int level, const char*, int, int, const std::string& message) {
+  log(true, category, level, message);
+}
+
+}  // namespace ZelLog
