@@ -36,12 +36,11 @@ std::vector<Source> makeSources(const DiscoveryOptions& options, const SystemRoo
 
 void addNode(NodeTreeBuilder& builder, NodeTreeBuilder::Handle parent, const FoundNode& found) {
   const NodeTreeBuilder::Handle node = builder.add(parent, found.type, found.position, found.description);
-  for (const FoundNode::Property& property : found.properties) {
-    if (const auto* text = std::get_if<std::string>(&property.value)) {
-      builder.setText(node, property.id, *text);
-    } else {
-      builder.setValue(node, property.id, std::get<std::uint32_t>(property.value));
-    }
+  for (const auto& [property, text] : found.texts) {
+    builder.setText(node, property, text);
+  }
+  for (const auto& [property, number] : found.numbers) {
+    builder.setValue(node, property, number);
   }
   for (const FoundNode& child : found.children) {
     addNode(builder, node, child);

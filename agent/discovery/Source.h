@@ -12,7 +12,7 @@
 #include <optional>
 #include <string>
 #include <string_view>
-#include <variant>
+#include <utility>
 #include <vector>
 
 namespace agent::discovery {
@@ -20,24 +20,20 @@ namespace agent::discovery {
 /// A node that a source found, with what it found below it. Descriptions steer what a node counts as, so they
 /// are the source's own words; of what the machine says, only names of ports and drivers go into one.
 struct FoundNode {
-  struct Property {
-    int id = 0;
-    std::variant<std::string, std::uint32_t> value;
-  };
-
   int type = 0;
   std::string position;  ///< the place on the bus: with the type, what the node's number is made of
   std::string description;
-  std::vector<Property> properties;
+  std::vector<std::pair<int, std::string>> texts;      ///< text properties
+  std::vector<std::pair<int, std::uint32_t>> numbers;  ///< number properties
   std::vector<FoundNode> children;
 
   /// Sets a text property; absent is absent.
   void setText(int property, const std::optional<std::string>& text) {
     if (text) {
-      properties.push_back({property, *text});
+      texts.emplace_back(property, *text);
     }
   }
-  void setValue(int property, std::uint32_t number) { properties.push_back({property, number}); }
+  void setValue(int property, std::uint32_t number) { numbers.emplace_back(property, number); }
 };
 
 /// All that one source found.
@@ -72,7 +68,7 @@ class SourceContext {
   void doing(const std::string& what);
   /// Reports that `path` could not be read, and the system's reason.
   void reportError(const std::string& path, int error);
-  void report(const std::string& path, SourceReport::Reason reason, std::string detail);
+  void report(const std::string& path, SourceReport::Reason reason, const std::string& detail);
 
   /// Makes what was found up to now the source's result in case the rest does not end in time.
   void publish();

@@ -78,7 +78,7 @@ void SourceContext::reportError(const std::string& path, int error) {
   report(path, reasonOf(error), errorText(error));
 }
 
-void SourceContext::report(const std::string& path, SourceReport::Reason reason, std::string detail) {
+void SourceContext::report(const std::string& path, SourceReport::Reason reason, const std::string& detail) {
   std::vector<SourceReport>& reports = result_.reports;
   if (reports.size() < reportLimit) {
     reports.push_back({source_, cleanText(path), reason, cleanText(detail)});

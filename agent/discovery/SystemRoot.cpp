@@ -101,7 +101,7 @@ Outcome<std::string> SystemRoot::resolve(std::string_view path) const {
       resolved = parentFolder(resolved);
       continue;
     }
-    std::string step = resolved.empty() ? name : resolved + "/" + name;
+    std::string step = within(resolved, name);
     const Outcome<std::string> target = readLink(outside(step));
     if (!target && target.error != EINVAL) {
       return {std::nullopt, target.error};
@@ -124,7 +124,7 @@ Outcome<std::string> SystemRoot::resolve(std::string_view path) const {
 Outcome<std::string> SystemRoot::read(std::string_view path, std::size_t limit) const {
   const Outcome<std::string> resolved = resolve(path);
   if (!resolved) {
-    return resolved;
+    return {std::nullopt, resolved.error};
   }
   // A pipe or a device in the place of a file must not hold up the caller: hence O_NONBLOCK.
   const File file(::open(outside(*resolved.value).c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK | O_NOFOLLOW));
@@ -189,14 +189,18 @@ Outcome<std::vector<std::string>> SystemRoot::list(std::string_view path) const 
   return {std::move(names), 0};
 }
 
-Outcome<std::string> SystemRoot::linkedName(std::string_view path) const {
+Outcome<std::string> SystemRoot::linkTarget(std::string_view path) const {
   const Outcome<std::string> folder = resolve(parentFolder(path));
   if (!folder) {
-    return folder;
+    return {std::nullopt, folder.error};
   }
-  const Outcome<std::string> target = readLink(outside(*folder.value + "/" + std::string(lastName(path))));
+  return readLink(outside(within(*folder.value, lastName(path))));
+}
+
+Outcome<std::string> SystemRoot::linkedName(std::string_view path) const {
+  const Outcome<std::string> target = linkTarget(path);
   if (!target) {
-    return target;
+    return {std::nullopt, target.error};
   }
   std::string_view text = *target.value;
   while (!text.empty() && text.back() == '/') {
@@ -207,6 +211,15 @@ Outcome<std::string> SystemRoot::linkedName(std::string_view path) const {
     return {std::nullopt, EINVAL};
   }
   return {std::string(name), 0};
+}
+
+std::string within(std::string_view folder, std::string_view name) {
+  std::string path(folder);
+  if (!path.empty()) {
+    path += '/';
+  }
+  path += name;
+  return path;
 }
 
 std::string_view lastName(std::string_view path) {

@@ -47,6 +47,9 @@ class SystemRoot {
   /// The names in a folder, sorted. EFBIG where they are more than `folderLimit`.
   [[nodiscard]] Outcome<std::vector<std::string>> list(std::string_view path) const;
 
+  /// The target of the link at `path`, as it stands there. EINVAL where `path` is no link.
+  [[nodiscard]] Outcome<std::string> linkTarget(std::string_view path) const;
+
   /// The last name in the target of the link at `path`: sysfs names drivers, modules and buses that way.
   /// EINVAL where `path` is no link.
   [[nodiscard]] Outcome<std::string> linkedName(std::string_view path) const;
@@ -55,6 +58,9 @@ class SystemRoot {
   std::string root_;  ///< without a slash at its end; empty for "/"
   bool live_ = false;
 };
+
+/// The path of `name` in `folder`.
+std::string within(std::string_view folder, std::string_view name);
 
 /// What follows the last slash.
 std::string_view lastName(std::string_view path);

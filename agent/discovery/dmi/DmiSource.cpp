@@ -53,12 +53,12 @@ void readDmi(SourceContext& context) {
     context.reportError(context.root().outside(folder), found.error);
     return;
   }
-  FoundNode bios{Oru::NodeLexicon::FirmwareNode, "bios", "BIOS", {}, {}};
+  FoundNode bios{Oru::NodeLexicon::FirmwareNode, "bios", "BIOS", {}, {}, {}};
   bios.setText(Oru::NodeLexicon::ManufacturerProperty, context.text(folder + "/bios_vendor"));
   bios.setText(Oru::NodeLexicon::VersionStringProperty, context.text(folder + "/bios_version"));
   readDate(context, bios);
   readRelease(context, bios);
-  if (!bios.properties.empty()) {
+  if (!bios.texts.empty() || !bios.numbers.empty()) {
     context.result().nodes.push_back(std::move(bios));
   }
 }

@@ -35,7 +35,7 @@ std::string moduleSpelling(std::string name) {
 /// The module of a driver. Kernels without loadable modules, and some buses, link no driver to its module;
 /// then a module's folder of the driver's name is the driver's.
 std::string moduleName(SourceContext& context, const std::string& bus, const std::string& driver) {
-  const std::string link = "sys/bus/" + bus + "/drivers/" + driver + "/module";
+  const std::string link = within(within(within("sys/bus", bus), within("drivers", driver)), "module");
   const Outcome<std::string> linked = context.root().linkedName(link);
   if (linked) {
     return *linked.value;
@@ -51,7 +51,7 @@ void findBound(SourceContext& context, const std::string& bus, Drivers& drivers)
   std::map<std::string, std::string> moduleOf;  // by driver
   const std::string folder = "sys/bus/" + bus + "/devices";
   for (const std::string& device : context.list(folder)) {
-    const std::string link = folder + "/" + device + "/driver";
+    const std::string link = within(within(folder, device), "driver");
     const Outcome<std::string> driver = context.root().linkedName(link);
     if (!driver) {
       if (reasonOf(driver.error) != SourceReport::Reason::Absent) {
@@ -74,7 +74,7 @@ void findBound(SourceContext& context, const std::string& bus, Drivers& drivers)
 std::vector<FoundNode> nodesOf(const Drivers& drivers) {
   std::vector<FoundNode> nodes;
   for (const auto& [key, driver] : drivers) {
-    FoundNode node{Oru::NodeLexicon::DriverNode, "driver:" + key, driver.name + " driver", {}, {}};
+    FoundNode node{Oru::NodeLexicon::DriverNode, "driver:" + key, driver.name + " driver", {}, {}, {}};
     node.setText(Oru::NodeLexicon::NameProperty, driver.name);
     node.setText(Oru::NodeLexicon::DriverVersionProperty, driver.version);
     node.setText(DrivenDevicesProperty, joinNames(driver.devices, drivenDevicesLimit));

@@ -22,8 +22,7 @@ std::optional<DriverInfo> parseDriverInfo(std::string_view bytes) {
   if (bytes.size() < sizeof(Layout)) {
     return std::nullopt;
   }
-  return DriverInfo{field(bytes, offsetof(Layout, driver), sizeof(Layout::driver)),
-                    field(bytes, offsetof(Layout, version), sizeof(Layout::version)),
+  return DriverInfo{field(bytes, offsetof(Layout, version), sizeof(Layout::version)),
                     field(bytes, offsetof(Layout, fw_version), sizeof(Layout::fw_version))};
 }
 

@@ -31,7 +31,6 @@ std::shared_ptr<Ethtool> makeKernelEthtool();
 
 /// What a driver says of itself. Texts are clean; what says nothing ("", "N/A") is absent.
 struct DriverInfo {
-  std::optional<std::string> driver;
   std::optional<std::string> driverVersion;
   std::optional<std::string> firmwareVersion;
 };

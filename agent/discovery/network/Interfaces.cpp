@@ -22,18 +22,16 @@ bool isHexadecimal(std::string_view text) {
 /// from the order in which drivers were bound.
 std::optional<std::string> addressIn(const SourceContext& context, const std::string& folder) {
   const std::string name(lastName(folder));
-  const Outcome<std::string> bus = context.root().linkedName(folder + "/subsystem");
-  if (!bus) {
+  const Outcome<std::string> subsystem = context.root().linkTarget(within(folder, "subsystem"));
+  if (!subsystem) {
     return isPciAddress(name) ? std::optional(name) : std::nullopt;
   }
-  if (*bus.value == "pci") {
-    return name;
-  }
-  const bool partOfFunction = *bus.value == "virtio" || *bus.value == "auxiliary";
-  if (partOfFunction || !context.root().resolve("sys/bus/" + *bus.value)) {
+  const std::string bus(lastName(*subsystem.value));
+  const bool isClass = lastName(parentFolder(*subsystem.value)) != "bus";
+  if (isClass || bus == "virtio" || bus == "auxiliary") {
     return std::nullopt;
   }
-  return *bus.value + ":" + name;
+  return bus == "pci" ? name : bus + ":" + name;
 }
 
 /// The address of the nearest function of a bus at or above `device`.

@@ -49,7 +49,6 @@ InfoByDevice askDrivers(SourceContext& context, Ethtool& ethtool, const Interfac
     DriverInfo& known = infos[address];
     for (const NetworkInterface& interface : interfaces) {
       if (const std::optional<DriverInfo> told = ask(context, ethtool, interface.name)) {
-        fill(known.driver, told->driver);
         fill(known.driverVersion, told->driverVersion);
         fill(known.firmwareVersion, told->firmwareVersion);
       }
@@ -61,16 +60,16 @@ InfoByDevice askDrivers(SourceContext& context, Ethtool& ethtool, const Interfac
 FoundNode deviceNode(const std::string& address, std::vector<NetworkInterface> interfaces,
                      const DriverInfo& info) {
   using namespace Oru;
-  FoundNode device{NodeLexicon::NetworkDeviceNode, address, "Network Device", {}, {}};
+  FoundNode device{NodeLexicon::NetworkDeviceNode, address, "Network Device", {}, {}, {}};
   device.setText(NodeLexicon::DriverVersionProperty, info.driverVersion);
   if (info.firmwareVersion) {
-    FoundNode firmware{NodeLexicon::FirmwareNode, address + "/firmware", "Network Firmware", {}, {}};
+    FoundNode firmware{NodeLexicon::FirmwareNode, address + "/firmware", "Network Firmware", {}, {}, {}};
     firmware.setText(NodeLexicon::VersionStringProperty, info.firmwareVersion);
     device.children.push_back(std::move(firmware));
   }
   const std::vector<std::string> identifiers = sortAndIdentify(address, interfaces);
   for (std::size_t i = 0; i < interfaces.size(); ++i) {
-    FoundNode port{NodeLexicon::NetworkPortNode, identifiers[i], interfaces[i].name, {}, {}};
+    FoundNode port{NodeLexicon::NetworkPortNode, identifiers[i], interfaces[i].name, {}, {}, {}};
     port.setText(NodeLexicon::NameProperty, identifiers[i]);
     device.children.push_back(std::move(port));
   }
