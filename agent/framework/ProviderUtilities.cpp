@@ -195,6 +195,7 @@ void ProviderUtilities::setKeyProperty(CMPIObjectPath* path, const char* name, C
   }
 }
 
+// NOLINTBEGIN(performance-unnecessary-value-param): the contract passes the namespace by value.
 CMPIObjectPath* ProviderUtilities::createObjectPath(const CMPIBroker* broker, const char* className,
                                                     std::string nameSpace) {
   const auto* factory = factoryOf(broker);
@@ -205,6 +206,7 @@ CMPIObjectPath* ProviderUtilities::createObjectPath(const CMPIBroker* broker, co
   CMPIObjectPath* path = factory->newObjectPath(broker, nameSpace.c_str(), className, &status);
   return status.rc == CMPI_RC_OK ? path : nullptr;
 }
+// NOLINTEND(performance-unnecessary-value-param)
 
 CMPIInstance* ProviderUtilities::createInstance(const CMPIBroker* broker, CMPIObjectPath* path) {
   const auto* factory = factoryOf(broker);

@@ -319,7 +319,7 @@ inline CMPIEnumeration* CBReferenceNames(const CMPIBroker* broker, const CMPICon
   extern "C" [[gnu::visibility("default")]] CMPIInstanceMI* provider##_Create_InstanceMI(                 \
       const CMPIBroker* brkr, [[maybe_unused]] const CMPIContext* ctx, [[maybe_unused]] CMPIStatus* rc) { \
     static CMPIInstanceMI mi{nullptr, &instMIFT__};                                                       \
-    brokerVariable = brkr;                                                                                \
+    (brokerVariable) = brkr;                                                                              \
     hook;                                                                                                 \
     return &mi;                                                                                           \
   }
@@ -331,7 +331,7 @@ inline CMPIEnumeration* CBReferenceNames(const CMPIBroker* broker, const CMPICon
   extern "C" [[gnu::visibility("default")]] CMPIAssociationMI* provider##_Create_AssociationMI(           \
       const CMPIBroker* brkr, [[maybe_unused]] const CMPIContext* ctx, [[maybe_unused]] CMPIStatus* rc) { \
     static CMPIAssociationMI mi{nullptr, &assocMIFT__};                                                   \
-    brokerVariable = brkr;                                                                                \
+    (brokerVariable) = brkr;                                                                              \
     hook;                                                                                                 \
     return &mi;                                                                                           \
   }
