@@ -54,8 +54,9 @@ CMPIData stringData(Arena& arena, std::string_view text) {
 }
 
 CMPIrc makeText(Arena& arena, const CMPIValue& value, CMPIType type, CMPIData& data) {
-  if (type == CMPI_chars && value.chars != nullptr) {
-    data = stringData(arena, value.chars);
+  if (type == CMPI_chars) {
+    // CMPI hands a text of this type over in the place of the value: the pointer is the text.
+    data = stringData(arena, reinterpret_cast<const char*>(&value));
   } else if (type == CMPI_charsptr && value.dataPtr.ptr != nullptr) {
     const char* const chars = static_cast<const char*>(value.dataPtr.ptr);
     data = stringData(arena, {chars, strnlen(chars, value.dataPtr.length)});
