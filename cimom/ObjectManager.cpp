@@ -22,7 +22,6 @@ ClassRepository compiled(const std::vector<std::filesystem::path>& schema) {
 BrokerSettings brokerSettings(const Configuration& configuration, UpcallTarget& upcalls) {
   BrokerSettings settings;
   settings.upcalls = &upcalls;
-  settings.providerFolder = configuration.providerFolder.string();
   if (configuration.log) {
     settings.log = [log = configuration.log](const LogEntry& entry) {
       if (!entry.isTrace)
