@@ -139,12 +139,14 @@ Value valueOf(const CMPIData& data) {
 
 [[noreturn]] void noSuchProperty(const cimom::SchemaClass& info, const std::string& name) {
   std::vector<std::string> known;
+  std::string list;
   for (const auto& property : info.properties) {
+    list.append(list.empty() ? "" : ", ").append(property.name);
     known.push_back(property.name);
   }
   const auto nearest = nearestName(name, known);
   throw CommandError(statusName(CMPI_RC_ERR_NO_SUCH_PROPERTY) + ": " + info.name() + " has no property '" +
-                     name + "'" + (nearest ? "; did you mean " + *nearest + "?" : ""));
+                     name + "'" + (nearest ? "; did you mean " + *nearest + "?" : "; it has " + list));
 }
 
 /// Members of JSON objects keep the order of the MOF, whatever was asked for first.

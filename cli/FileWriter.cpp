@@ -4,6 +4,7 @@
 
 #include <cerrno>
 #include <cstdio>
+#include <random>
 #include <string>
 #include <system_error>
 
@@ -25,7 +26,7 @@ namespace {
 class TemporaryFile {
  public:
   explicit TemporaryFile(const std::filesystem::path& target)
-      : target_(target), name_(target.string() + ".swinv-" + std::to_string(getpid())) {
+      : target_(target), name_(target.string() + ".swinv-" + std::to_string(std::random_device()())) {
     descriptor_ = open(name_.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0666);
     if (descriptor_ < 0) {
       fail(target_, errno);

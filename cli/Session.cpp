@@ -70,15 +70,23 @@ cimom::Configuration configure(const Options& options) {
   return configuration;
 }
 
-std::string hintFor(CMPIrc code, bool logs) {
-  switch (code) {
-    case CMPI_RC_ERR_NOT_FOUND:
-      return "\n'swinv names' shows what there is.";
-    case CMPI_RC_ERR_FAILED:
-      return logs ? "" : "\n--log-level error shows what the provider has to say.";
-    default:
-      return {};
+/// What to do about a failure that has no description: a provider's status carries none.
+std::string hintFor(const cimom::Status& status, bool logs) {
+  if (status.code == CMPI_RC_ERR_NOT_FOUND) {
+    return "\n'swinv names' shows what there is.";
   }
+  return status.description.empty() && !logs ? "\n--log-level error shows what the provider has to say." : "";
+}
+
+/// This system's own classes; the rest of the schema is what they derive from.
+std::string ownClasses(const cimom::ClassRepository& classes) {
+  std::string names;
+  for (const cimom::SchemaClass* each : classes.all()) {
+    if (!each->name().starts_with("CIM_")) {
+      names.append(names.empty() ? "" : ", ").append(each->name());
+    }
+  }
+  return names;
 }
 
 }  // namespace
@@ -104,8 +112,9 @@ const cimom::SchemaClass& Session::classNamed(const std::string& name) const {
     known.push_back(other->name());
   }
   const auto nearest = nearestName(name, known);
-  throw CommandError(statusName(CMPI_RC_ERR_INVALID_CLASS) + ": the schema has no class '" + name + "'" +
-                     (nearest ? "; did you mean " + *nearest + "?" : ""));
+  throw CommandError(
+      statusName(CMPI_RC_ERR_INVALID_CLASS) + ": the schema has no class '" + name + "'" +
+      (nearest ? "; did you mean " + *nearest + "?" : "; try " + ownClasses(manager_->classes())));
 }
 
 void Session::conclude(const cimom::Outcome& outcome, const std::string& what, RowWriter& writer,
@@ -122,7 +131,7 @@ void Session::conclude(const cimom::Outcome& outcome, const std::string& what, R
   if (failed) {
     const std::string& description = outcome.status.description;
     throw CommandError(statusName(outcome.status.code) + ": " + what +
-                       (description.empty() ? "" : ": " + description) + hintFor(outcome.status.code, logs_));
+                       (description.empty() ? "" : ": " + description) + hintFor(outcome.status, logs_));
   }
   if (!outcome.done) {
     complain(logs_ ? "the provider stopped early; its log above says why"

@@ -10,7 +10,7 @@ namespace cli {
 namespace {
 
 constexpr std::size_t gap = 2;            // blanks between columns
-constexpr std::size_t narrowest = 10;     // a column is not cut below this
+constexpr std::size_t narrowest = 16;     // a column is not cut below this: versions are longer than words
 constexpr std::size_t narrowestWrap = 8;  // nor a wrapped value in a block
 
 /// "//host/root/cimv2:Class.Key=..." without what stands before the class name.

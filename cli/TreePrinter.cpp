@@ -56,7 +56,7 @@ std::string nodeText(const NodeTree& tree, NodeTree::Index node) {
     text.append(" ").append(description);
   }
   const auto name = tree.text(node, lexicon::NameProperty);
-  if (name && *name != description) {
+  if (name && description.find(*name) == std::string_view::npos) {
     text.append(" (").append(*name).append(")");
   }
   if (const auto versionText = version(tree, node)) {

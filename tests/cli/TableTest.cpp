@@ -104,10 +104,10 @@ TEST(Table, TheWidestColumnsGiveFirst) {
 
 TEST(Table, WholeColumnsAreNeverCut) {
   const cli::Columns columns{{"InstanceID", {}, true}, {"Description"}};
-  EXPECT_EQ(tableOf(columns, {42, Charset::Ascii},
+  EXPECT_EQ(tableOf(columns, {44, Charset::Ascii},
                     {{word("1152921504606846976@abcdef"), word("A long description")}}),
             "InstanceID                  Description\n"
-            "1152921504606846976@abcdef  A long desc...\n");
+            "1152921504606846976@abcdef  A long descri...\n");
 }
 
 TEST(Table, ColumnsOfAHighRankGoFirst) {
