@@ -21,7 +21,7 @@ namespace cimom {
 struct ProviderRegistration {
   std::string className;
   std::string provider;      ///< prefix of the factories: PROVIDER_Create_InstanceMI
-  std::string location;      ///< the library: libLOCATION.so; set by a program, also its absolute path
+  std::string location;      ///< the library: libLOCATION.so; from a program, also a path
   bool instance = false;     ///< serves the instance operations
   bool association = false;  ///< serves the association operations
   std::vector<std::string> nameSpaces;  ///< at least one, without a leading slash
