@@ -208,6 +208,7 @@ bool Instrumentation::getProperty(NodeLexicon::Properties property, unsigned int
 }
 
 // The tree shows what the machine is; no element of it takes a value from outside, so every write is refused.
+// NOLINTNEXTLINE(performance-unnecessary-value-param): the contract has it by value
 bool Instrumentation::setProperty(NodeLexicon::Properties, std::vector<unsigned int>) {
   return false;
 }

@@ -298,11 +298,7 @@ class Handler {
       builder_.setValue(node, top().property, static_cast<std::uint32_t>(scalar.number));
       return true;
     }
-    if (scalar.kind != Scalar::Kind::Text || cleanText(scalar.text).empty()) {
-      return false;
-    }
-    builder_.setText(node, top().property, scalar.text);
-    return true;
+    return scalar.kind == Scalar::Kind::Text && builder_.setText(node, top().property, scalar.text);
   }
 
   bool takeNodeField(const Scalar& scalar) {

@@ -178,9 +178,10 @@ class NodeTreeBuilder {
   void describe(Handle node, int type, std::string_view position, std::string_view description);
   /// Gives a node its number outright.
   void setNumber(Handle node, NodeNumber number);
-  /// Sets a text property; a text that is empty after `cleanText` sets nothing: absent is absent. Of several
-  /// settings of one property the last stands. Throws `std::invalid_argument` for a negative property.
-  void setText(Handle node, int property, std::string_view text);
+  /// Sets a text property; a text that is empty after `cleanText` sets nothing (absent is absent) and gives
+  /// false. Of several settings of one property the last stands. Throws `std::invalid_argument` for a
+  /// negative property.
+  bool setText(Handle node, int property, std::string_view text);
   /// Sets a number property; as above.
   void setValue(Handle node, int property, std::uint32_t number);
   /// Adds a report; its texts are taken through `cleanText`.

@@ -67,11 +67,12 @@ void NodeTreeBuilder::setProperty(Handle node, NodeTree::Property property) {
   properties_.push_back({node, property});
 }
 
-void NodeTreeBuilder::setText(Handle node, int property, std::string_view text) {
+bool NodeTreeBuilder::setText(Handle node, int property, std::string_view text) {
   const NodeTree::TextRange range = keep(text);
   if (range.length != 0) {
     setProperty(node, {property, 1, range});
   }
+  return range.length != 0;
 }
 
 void NodeTreeBuilder::setValue(Handle node, int property, std::uint32_t number) {

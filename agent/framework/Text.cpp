@@ -71,6 +71,16 @@ Character firstCharacter(std::string_view text) {
   return {sequence.length, true, first == 0xC2 && second < 0xA0};
 }
 
+/// Is this a text that most are: printable ASCII without blanks at its ends?
+bool isPlain(std::string_view text) {
+  // Without a way out of the loop, so that it takes many characters at a time.
+  unsigned int isOther = 0;
+  for (const char character : text) {
+    isOther |= static_cast<unsigned char>(asByte(character) - 0x20U) > 0x7E - 0x20 ? 1U : 0U;
+  }
+  return isOther == 0 && (text.empty() || (text.front() != ' ' && text.back() != ' '));
+}
+
 void trimEnd(std::string& text) {
   while (!text.empty() && text.back() == ' ') {
     text.pop_back();
@@ -135,6 +145,9 @@ NodeNumber numberFor(int type, std::string_view position, std::uint32_t n) {
 }
 
 std::string cleanText(std::string_view text) {
+  if (isPlain(text)) {
+    return std::string(text);
+  }
   std::string clean;
   clean.reserve(text.size());
   while (!text.empty()) {

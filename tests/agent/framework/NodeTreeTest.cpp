@@ -267,8 +267,8 @@ TEST(NodeTree, FindsEachNodeAndNoOther) {
 }
 
 TEST(NodeTree, HasConsistentIndices) {
-  for (std::uint64_t seed = 0; seed < 200; ++seed) {
-    const NodeTree tree = testing::RandomTree(seed).make(300);
+  for (std::uint64_t seed = 0; seed < 100; ++seed) {
+    const NodeTree tree = testing::RandomTree(seed).make(100);
     std::map<int, std::vector<NodeTree::Index>> byType;
     for (NodeTree::Index node = 0; node < tree.size(); ++node) {
       byType[tree.type(node)].push_back(node);
