@@ -96,8 +96,8 @@ struct ObjectManager::State {
   Routes routes;  ///< goes first: providers are unloaded while the broker is there
 };
 
-ObjectManager::ObjectManager(Configuration configuration)
-    : state_(std::make_unique<State>(std::move(configuration))) {}
+ObjectManager::ObjectManager(const Configuration& configuration)
+    : state_(std::make_unique<State>(configuration)) {}
 
 ObjectManager::~ObjectManager() = default;
 

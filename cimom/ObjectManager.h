@@ -42,7 +42,7 @@ class ObjectManager {
   /// registered class is not in the schema or is registered twice in a namespace. Providers are loaded when a
   /// request first needs them; `tzset` is called once before. They are cleaned up and unloaded with the
   /// object manager, when no request may be under way.
-  explicit ObjectManager(Configuration configuration);
+  explicit ObjectManager(const Configuration& configuration);
   ~ObjectManager();
   ObjectManager(const ObjectManager&) = delete;
   ObjectManager& operator=(const ObjectManager&) = delete;
