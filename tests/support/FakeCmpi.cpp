@@ -3,6 +3,7 @@
 #include <strings.h>
 
 #include <algorithm>
+#include <cstring>
 
 namespace tests {
 namespace {
@@ -14,6 +15,27 @@ void set(CMPIStatus* status, CMPIrc rc) {
 }
 
 constexpr std::size_t dateTimeLength = 25;
+
+/// The bytes of a value of that type: callers hand over the address of a variable of the type, not of a whole
+/// CMPIValue. Objects and arrays are pointers.
+std::size_t sizeOf(CMPIType type) {
+  switch (type) {
+    case CMPI_boolean:
+    case CMPI_uint8:
+    case CMPI_sint8:
+      return 1;
+    case CMPI_char16:
+    case CMPI_uint16:
+    case CMPI_sint16:
+      return 2;
+    case CMPI_uint32:
+    case CMPI_sint32:
+    case CMPI_real32:
+      return 4;
+    default:
+      return sizeof(void*);
+  }
+}
 
 }  // namespace
 
@@ -75,7 +97,9 @@ CMPIData FakeCmpi::store(const CMPIValue* value, CMPIType type) {
   if (type == CMPI_chars) {
     return stringData(reinterpret_cast<const char*>(value));
   }
-  return {type, CMPI_goodValue, *value};
+  CMPIData data{type, CMPI_goodValue, {}};
+  std::memcpy(&data.value, value, sizeOf(type));
+  return data;
 }
 
 void FakeCmpi::put(std::vector<Entry>& entries, const char* name, const CMPIData& data) {
