@@ -15,6 +15,19 @@ endif()
 target_link_options(swinv_options INTERFACE LINKER:--as-needed)
 link_libraries(swinv_options)
 
+# With CMPI_INCLUDE_DIR the names <cmpi/...> lead to that system's headers, through forwarding files: a compiler's own
+# folder such as /usr/include cannot be moved ahead by an -I. Their folder stands before all others, because
+# provider/include, which everyone needs for other headers, holds the project's own declarations too.
+if(CMPI_INCLUDE_DIR)
+  foreach(header cmpidt.h cmpift.h cmpimacs.h)
+    find_file(CMPI_HEADER_${header} ${header}
+      PATHS ${CMPI_INCLUDE_DIR} PATH_SUFFIXES cmpi NO_DEFAULT_PATH REQUIRED)
+    file(CONFIGURE OUTPUT ${CMAKE_BINARY_DIR}/cmpi-forward/cmpi/${header} @ONLY
+      CONTENT "#pragma GCC system_header\n#include \"${CMPI_HEADER_${header}}\"\n")
+  endforeach()
+  include_directories(BEFORE ${CMAKE_BINARY_DIR}/cmpi-forward)
+endif()
+
 # swinv_export_only(TARGET FILE): exports what the linker map FILE lists, and nothing else.
 function(swinv_export_only target map)
   target_link_options(${target} PRIVATE LINKER:--version-script=${map})
