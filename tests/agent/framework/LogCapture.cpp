@@ -57,7 +57,11 @@ extern "C" void syslog(int priority, const char* format, ...) {
   std::array<char, 4096> text{};
   va_list arguments;
   va_start(arguments, format);
-  std::vsnprintf(text.data(), text.size(), format, arguments);
+  // NOLINTNEXTLINE(clang-analyzer-valist.Uninitialized): va_start above makes it
+  const int length = std::vsnprintf(text.data(), text.size(), format, arguments);
   va_end(arguments);
+  if (length < 0) {
+    throw std::runtime_error("A message to syslog cannot be formatted");
+  }
   tests::syslogMessages().push_back(std::to_string(priority) + " " + text.data());
 }

@@ -236,6 +236,7 @@ TEST_F(LogChannelsTest, threadsKeepEachOthersLinesWhole) {
   {
     LogChannels channels(settings);
     std::vector<std::thread> threads;
+    threads.reserve(threadCount);
     for (int number = 0; number < threadCount; ++number) {
       threads.emplace_back([&channels, number] {
         for (int line = 0; line < linesPerThread; ++line) {

@@ -155,6 +155,7 @@ TEST(ZelLogger, threadsMayAllBeFirst) {
       {{"ORU_LOG_LEVEL", "trace"}, {"ORU_LOG", "file:" + file.path()}, {"ORU_TRACE", "file:" + file.path()}},
       [] {
         std::vector<std::thread> threads;
+        threads.reserve(threadCount);
         for (int number = 0; number < threadCount; ++number) {
           threads.emplace_back([] {
             for (int line = 0; line < linesPerThread; ++line) {
