@@ -1,6 +1,7 @@
 #include <agent/discovery/SourceBoard.h>
 #include <agent/discovery/SourceRunner.h>
 
+#include <algorithm>
 #include <csignal>
 #include <exception>
 #include <system_error>
@@ -97,7 +98,8 @@ SourceResult finish(const std::string& source, Running& running, std::chrono::mi
 
 std::vector<SourceResult> runSources(const std::vector<Source>& sources, const SystemRoot& root,
                                      std::chrono::milliseconds limit) {
-  const Clock::time_point deadline = Clock::now() + limit;
+  constexpr std::chrono::milliseconds longest = std::chrono::hours(24);  // what a clock can add to any now
+  const Clock::time_point deadline = Clock::now() + std::min(limit, longest);
   std::vector<Running> running;
   {
     const SignalsBlocked blocked;

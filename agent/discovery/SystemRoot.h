@@ -55,6 +55,9 @@ class SystemRoot {
   [[nodiscard]] Outcome<std::string> linkedName(std::string_view path) const;
 
  private:
+  /// A path that names the same file and holds no link that could lead out.
+  [[nodiscard]] Outcome<std::string> locate(std::string_view path) const;
+
   std::string root_;  ///< without a slash at its end; empty for "/"
   bool live_ = false;
 };

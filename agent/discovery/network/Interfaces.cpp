@@ -11,6 +11,7 @@ namespace agent::discovery {
 namespace {
 
 constexpr std::uint32_t highestPort = 0xffff;
+constexpr std::uint32_t highestIndex = 0x7fffffff;
 constexpr int deepestDevice = 64;
 
 bool isHexadecimal(std::string_view text) {
@@ -46,9 +47,18 @@ std::string functionAddress(const SourceContext& context, const std::string& dev
   return "device:" + std::string(lastName(device));
 }
 
-std::optional<std::uint32_t> number(SourceContext& context, const std::string& path) {
+std::optional<std::uint32_t> numberIfAny(SourceContext& context, const std::string& path,
+                                         std::uint32_t limit) {
   const std::optional<std::string> text = context.textIfAny(path);
-  return text ? parseNumber(*text, highestPort) : std::nullopt;
+  if (!text) {
+    return std::nullopt;
+  }
+  const std::optional<std::uint32_t> number = parseNumber(*text, limit);
+  if (!number) {
+    context.report(context.root().outside(path), SourceReport::Reason::Unreadable,
+                   "\"" + *text + "\" is no number up to " + std::to_string(limit));
+  }
+  return number;
 }
 
 /// Whether the name is a representor's: the host's end of a virtual or sub-function, "pf0vf1", "c1pf0sf88".
@@ -72,10 +82,10 @@ NetworkInterface readInterface(SourceContext& context, const std::string& name) 
   const std::string folder = "sys/class/net/" + name;
   NetworkInterface interface;
   interface.name = name;
-  interface.port = portNumber(number(context, folder + "/dev_port"), number(context, folder + "/dev_id"));
+  interface.port = portNumber(numberIfAny(context, folder + "/dev_port", highestPort),
+                              numberIfAny(context, folder + "/dev_id", highestPort));
   interface.physicalName = context.textIfAny(folder + "/phys_port_name");
-  const std::optional<std::string> index = context.textIfAny(folder + "/ifindex");
-  interface.index = index ? parseNumber(*index).value_or(0) : 0;
+  interface.index = numberIfAny(context, folder + "/ifindex", highestIndex).value_or(0);
   return interface;
 }
 

@@ -187,6 +187,17 @@ TEST(NetworkSource, AnUnreadableDeviceLinkIsReported) {
   EXPECT_EQ(report->reason, SourceReport::Reason::Unreadable);
 }
 
+TEST(NetworkSource, AnOddPortNumberIsReportedAndCountsAsTheFirst) {
+  Machine machine(pciFunction);
+  machine.add(interfaceLines("e0", pciDevice, "dev_port = 65536"));
+  const NodeTree tree = discoverAt(machine, telling({}));
+  EXPECT_EQ(tree.text(described(tree, "e0"), Oru::NodeLexicon::NameProperty), "0000:03:00.0/1");
+  const auto report = reportOn(tree, "network", "e0/dev_port");
+  ASSERT_TRUE(report);
+  EXPECT_EQ(report->reason, SourceReport::Reason::Unreadable);
+  EXPECT_EQ(report->detail, "\"65536\" is no number up to 65535");
+}
+
 TEST(KernelEthtoolTest, AnUnknownInterfaceIsNoDevice) {
   const auto ethtool = makeKernelEthtool();
   EXPECT_EQ(ethtool->driverInfo("no-such-if").error, ENODEV);

@@ -137,6 +137,12 @@ TEST(SourceRunner, AHangingSourceIsReportedWithWhatItPublishedBefore) {
   door->open();
 }
 
+TEST(SourceRunner, ADeadlineBeyondTheClockIsNone) {
+  const std::vector<Source> sources = {
+      {"works", [](SourceContext& context) { context.result().nodes.push_back(nodeAt("fine")); }}};
+  EXPECT_EQ(runSources(sources, anyRoot(), std::chrono::milliseconds::max())[0].nodes.size(), 1U);
+}
+
 TEST(SourceRunner, AThrowingSourceIsReportedAndKeepsWhatItFound) {
   const std::vector<Source> sources = {{"throws", [](SourceContext& context) {
                                           context.result().nodes.push_back(nodeAt("found"));

@@ -5,6 +5,7 @@
 #include <gtest/gtest.h>
 
 #include <sys/stat.h>
+#include <unistd.h>
 
 #include <cerrno>
 
@@ -75,6 +76,17 @@ TEST(SystemRootTest, ReadsFilesAlone) {
   EXPECT_EQ(root.read("pipe").error, EINVAL) << "and does not wait for a writer";
   EXPECT_EQ(root.read("nothing").error, ENOENT);
   EXPECT_EQ(root.read("folder/value/below").error, ENOTDIR);
+}
+
+TEST(SystemRootTest, ReadsTheRunningSystem) {
+  const SystemRoot root("/");
+  const auto release = root.read("proc/sys/kernel/osrelease");
+  ASSERT_TRUE(release);
+  EXPECT_GT(release.value->size(), 1U);
+  EXPECT_TRUE(root.read("proc/self/comm")) << "through a link";
+  EXPECT_EQ(root.linkedName("proc/self").value, std::to_string(::getpid()));
+  EXPECT_EQ(root.read("proc").error, EISDIR);
+  EXPECT_EQ(root.read("dev/null").error, EINVAL);
 }
 
 TEST(SystemRootTest, ListsNamesInOrder) {
