@@ -51,8 +51,12 @@ TEST_F(ProviderPropertiesTest, readsStrings) {
 }
 
 TEST_F(ProviderPropertiesTest, whatIsNoStringReadsAsFalse) {
-  cmpi.setProperty(instance, "Null", CMPIData{CMPI_string, CMPI_nullValue, {}});
-  cmpi.setProperty(instance, "Bad", CMPIData{CMPI_string, CMPI_badValue, {}});
+  // The state decides, also where the value looks like one.
+  CMPIData data = cmpi.stringData("text");
+  data.state = CMPI_nullValue;
+  cmpi.setProperty(instance, "Null", data);
+  data.state = CMPI_badValue;
+  cmpi.setProperty(instance, "Bad", data);
   cmpi.setProperty(instance, "NullText", cmpi.stringData(nullptr));
   cmpi.setProperty(instance, "Number", CMPIData{CMPI_uint16, CMPI_goodValue, {}});
   std::string value = "before";
