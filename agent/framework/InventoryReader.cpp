@@ -1,5 +1,6 @@
 #include <agent/framework/InventoryFields.h>
 #include <agent/framework/InventoryFile.h>
+#include <agent/framework/InventoryScalar.h>
 #include <agent/framework/Names.h>
 
 #include <rapidjson/error/en.h>
@@ -20,32 +21,7 @@ namespace {
 
 using inventory::Field;
 using inventory::Place;
-
-/// A JSON value that is neither object nor array.
-struct Scalar {
-  enum class Kind { Null, Bool, Number, OtherNumber, Text };
-  Kind kind = Kind::Null;
-  std::uint64_t number = 0;  ///< where the kind is Number: an integer from 0 on
-  std::string_view text;     ///< where the kind is Text
-};
-
-std::string shown(const Scalar& value) {
-  constexpr std::size_t longest = 40;
-  switch (value.kind) {
-    case Scalar::Kind::Null:
-      return "null";
-    case Scalar::Kind::Bool:
-      return "a boolean";
-    case Scalar::Kind::Number:
-      return std::to_string(value.number);
-    case Scalar::Kind::OtherNumber:
-      return "a number that is negative, has a fraction or is too big";
-    case Scalar::Kind::Text:
-      break;
-  }
-  const bool isLong = value.text.size() > longest;
-  return '"' + cleanText(value.text.substr(0, longest)) + (isLong ? "...\"" : "\"");
-}
+using inventory::Scalar;
 
 /// An object or array that is being read.
 struct Frame {
