@@ -7,11 +7,10 @@
 namespace cimom {
 
 Array::Array(Arena& arena, CMPIData* elements, std::size_t size, CMPIType simpleType)
-    : CMPIArray{this, &arrayTable},
-      arena_(&arena),
-      elements_(elements),
-      size_(size),
-      simpleType_(simpleType) {}
+    : CMPIArray{}, arena_(&arena), elements_(elements), size_(size), simpleType_(simpleType) {
+  hdl = this;
+  ft = &arrayTable;
+}
 
 Array* Array::create(Arena& arena, std::size_t size, CMPIType simpleType) {
   if (size > maximumSize || !isSimpleType(simpleType)) {

@@ -187,7 +187,7 @@ CMPIStatus openMessageFile(const CMPIBroker* broker, const char* /*file*/, File 
                                                           : CMPI_RC_ERR_NOT_SUPPORTED);
 }
 
-CMPIStatus closeMessageFile(const CMPIBroker* broker, const CMPIMsgFileHandle /*handle*/) {
+CMPIStatus closeMessageFile(const CMPIBroker* broker, CMPIMsgFileHandle /*handle*/) {
   return makeStatus(BrokerCalls::state(broker) == nullptr ? CMPI_RC_ERR_INVALID_HANDLE
                                                           : CMPI_RC_ERR_NOT_SUPPORTED);
 }
@@ -203,7 +203,7 @@ CMPIString* getMessage(const CMPIBroker* broker, const char* /*id*/, const char*
   });
 }
 
-CMPIString* getMessage2(const CMPIBroker* broker, const char* /*id*/, const CMPIMsgFileHandle /*file*/,
+CMPIString* getMessage2(const CMPIBroker* broker, const char* /*id*/, CMPIMsgFileHandle /*file*/,
                         const char* text, CMPIStatus* status, CMPICount count, ...) {
   va_list inserts;
   va_start(inserts, count);

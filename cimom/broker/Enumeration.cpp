@@ -7,11 +7,10 @@
 namespace cimom {
 
 Enumeration::Enumeration(Arena& arena, CMPIType type, const CMPIData* elements, std::size_t size)
-    : CMPIEnumeration{this, &enumerationTable},
-      arena_(&arena),
-      elements_(elements),
-      size_(size),
-      type_(type) {}
+    : CMPIEnumeration{}, arena_(&arena), elements_(elements), size_(size), type_(type) {
+  hdl = this;
+  ft = &enumerationTable;
+}
 
 Enumeration* Enumeration::create(Arena& arena, CMPIType type, std::span<const CMPIData> elements) {
   auto* const kept = arena.array<CMPIData>(elements.size());

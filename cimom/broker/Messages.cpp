@@ -1,7 +1,6 @@
 #include <cimom/broker/Messages.h>
 #include <cimom/broker/Objects.h>
 
-#include <optional>
 #include <string_view>
 #include <vector>
 
@@ -9,53 +8,54 @@ namespace cimom {
 
 namespace {
 
-std::optional<std::string> readNumber(CMPIType type, va_list* inserts) {
-  switch (type) {
-    case CMPI_boolean:
-      return va_arg(*inserts, int) != 0 ? "true" : "false";
-    case CMPI_uint8:
-    case CMPI_uint16:
-    case CMPI_char16:
-    case CMPI_sint8:
-    case CMPI_sint16:
-    case CMPI_sint32:
-      return std::to_string(va_arg(*inserts, int));
-    case CMPI_uint32:
-      return std::to_string(va_arg(*inserts, unsigned int));
-    case CMPI_uint64:
-      return std::to_string(va_arg(*inserts, CMPIUint64));
-    case CMPI_sint64:
-      return std::to_string(va_arg(*inserts, CMPISint64));
-    case CMPI_real32:
-    case CMPI_real64:
-      return std::to_string(va_arg(*inserts, double));
-    default:
-      return std::nullopt;
-  }
+std::string textOf(const char* chars) {
+  return chars == nullptr ? "(null)" : chars;
 }
 
-std::optional<std::string> readInsert(va_list* inserts) {
-  const auto type = static_cast<CMPIType>(va_arg(*inserts, int));
-  if (type == CMPI_chars) {
-    const char* const chars = va_arg(*inserts, const char*);
-    return chars == nullptr ? "(null)" : chars;
-  }
-  if (type == CMPI_string) {
-    const String* const string = String::from(va_arg(*inserts, const CMPIString*));
-    return string == nullptr ? "(null)" : std::string(string->view());
-  }
-  return readNumber(type, inserts);
+std::string textOf(const CMPIString* handle) {
+  const String* const string = String::from(handle);
+  return string == nullptr ? "(null)" : std::string(string->view());
 }
 
-std::vector<std::string> readInserts(CMPICount count, va_list* inserts) {
+// Ends at a type whose value cannot be skipped.
+std::vector<std::string> readInserts(CMPICount count, va_list inserts) {
   constexpr CMPICount most = 10;  // no placeholder names a later one
   std::vector<std::string> texts;
   while (texts.size() < count && texts.size() < most) {
-    auto insert = readInsert(inserts);
-    if (!insert) {
-      break;
+    switch (va_arg(inserts, int)) {
+      case CMPI_boolean:
+        texts.emplace_back(va_arg(inserts, int) != 0 ? "true" : "false");
+        break;
+      case CMPI_uint8:
+      case CMPI_uint16:
+      case CMPI_char16:
+      case CMPI_sint8:
+      case CMPI_sint16:
+      case CMPI_sint32:
+        texts.push_back(std::to_string(va_arg(inserts, int)));
+        break;
+      case CMPI_uint32:
+        texts.push_back(std::to_string(va_arg(inserts, unsigned int)));
+        break;
+      case CMPI_uint64:
+        texts.push_back(std::to_string(va_arg(inserts, CMPIUint64)));
+        break;
+      case CMPI_sint64:
+        texts.push_back(std::to_string(va_arg(inserts, CMPISint64)));
+        break;
+      case CMPI_real32:
+      case CMPI_real64:
+        texts.push_back(std::to_string(va_arg(inserts, double)));
+        break;
+      case CMPI_chars:
+        texts.push_back(textOf(va_arg(inserts, const char*)));
+        break;
+      case CMPI_string:
+        texts.push_back(textOf(va_arg(inserts, const CMPIString*)));
+        break;
+      default:
+        return texts;
     }
-    texts.push_back(std::move(*insert));
   }
   return texts;
 }
@@ -63,10 +63,7 @@ std::vector<std::string> readInserts(CMPICount count, va_list* inserts) {
 }  // namespace
 
 std::string formatMessage(const char* text, CMPICount count, va_list inserts) {
-  va_list reading;
-  va_copy(reading, inserts);
-  const std::vector<std::string> texts = readInserts(count, &reading);
-  va_end(reading);
+  const std::vector<std::string> texts = readInserts(count, inserts);
   const std::string_view pattern = text == nullptr ? std::string_view() : text;
   std::string out;
   for (std::size_t position = 0; position < pattern.size(); ++position) {

@@ -153,6 +153,7 @@ class ObjectPath final : public CMPIObjectPath {
   void setNameSpace(std::string_view nameSpace);
   void setHostName(std::string_view hostName);
   void setClassName(std::string_view className);
+  /// `value` as CMPI passes it: of type CMPI_chars it is the text itself, not a union with a pointer to it.
   /// Replaces a key of the same name. Names and types are not held against the class: paths carry what a
   /// client sent. CMPI_RC_ERR_INVALID_DATA_TYPE for what no key can be (arrays, instances), as CMPI has it;
   /// CMPI_RC_ERR_INVALID_PARAMETER for an empty name, CMPI_RC_ERR_INVALID_HANDLE for a foreign object.

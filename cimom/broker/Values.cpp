@@ -53,13 +53,13 @@ CMPIData stringData(Arena& arena, std::string_view text) {
   return data;
 }
 
-CMPIrc makeText(Arena& arena, const CMPIValue& value, CMPIType type, CMPIData& data) {
+// CMPI passes a text of type CMPI_chars in the place of the value: the pointer is the text, at any address.
+CMPIrc makeText(Arena& arena, const CMPIValue* value, CMPIType type, CMPIData& data) {
   if (type == CMPI_chars) {
-    // CMPI hands a text of this type over in the place of the value: the pointer is the text.
-    data = stringData(arena, reinterpret_cast<const char*>(&value));
-  } else if (type == CMPI_charsptr && value.dataPtr.ptr != nullptr) {
-    const char* const chars = static_cast<const char*>(value.dataPtr.ptr);
-    data = stringData(arena, {chars, strnlen(chars, value.dataPtr.length)});
+    data = stringData(arena, reinterpret_cast<const char*>(value));
+  } else if (value->dataPtr.ptr != nullptr) {
+    const char* const chars = static_cast<const char*>(value->dataPtr.ptr);
+    data = stringData(arena, {chars, strnlen(chars, value->dataPtr.length)});
   } else {
     data = nullData(CMPI_string);
   }
@@ -157,7 +157,7 @@ CMPIrc makeData(Arena& arena, const CMPIValue* value, CMPIType type, CMPIData& d
     return makeArray(arena, *value, keptType(type), data);
   }
   if (type == CMPI_chars || type == CMPI_charsptr) {
-    return makeText(arena, *value, type, data);
+    return makeText(arena, value, type, data);
   }
   CMPIData scalar = goodData(type);
   if (copyScalar(*value, type, scalar.value)) {

@@ -96,7 +96,7 @@ void appendPath(std::string& out, const ObjectPath& path, unsigned depth) {
   }
   out += path.className();
   // Each level of quotes doubles the backslashes of the one inside.
-  if (depth > wbemUriDepth) {
+  if (depth == wbemUriDepth) {
     return;
   }
   char separator = '.';

@@ -33,7 +33,7 @@ class WbemUriError : public std::runtime_error {
 };
 
 /// With host and namespace where the path has them; keys in their order. `parseWbemUri` gives the same path.
-/// References nested deeper than `wbemUriDepth` lose their keys.
+/// References nested `wbemUriDepth` deep lose their keys.
 [[nodiscard]] std::string formatWbemUri(const ObjectPath& path);
 
 /// A path in `arena`. `defaultNameSpace` is for texts without one. Throws `WbemUriError`; also for text

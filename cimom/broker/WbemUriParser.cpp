@@ -267,7 +267,7 @@ class Parser {
     } else if (text_[position_] == '\'' || static_cast<unsigned char>(text_[position_]) >= 0x80) {
       fail("an ASCII character or \\x and hexadecimal digits");
     } else {
-      character = static_cast<CMPIChar16>(text_[position_++]);
+      character = static_cast<unsigned char>(text_[position_++]);
     }
     expect('\'', "a closing single quote");
     return character;
@@ -275,7 +275,7 @@ class Parser {
 
   CMPIChar16 readEscape() {
     if (!atEnd() && (text_[position_] == '\'' || text_[position_] == '\\')) {
-      return static_cast<CMPIChar16>(text_[position_++]);
+      return static_cast<unsigned char>(text_[position_++]);
     }
     expect('x', "\\', \\\\ or \\x and hexadecimal digits");
     const std::string_view digits = rest().substr(0, 4);
