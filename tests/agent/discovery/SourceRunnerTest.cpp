@@ -84,6 +84,7 @@ SystemRoot anyRoot() {
 
 TEST(SourceRunner, ResultsStandInTheOrderOfTheSources) {
   std::vector<Source> sources;
+  sources.reserve(5);
   for (int i = 0; i < 5; ++i) {
     sources.push_back({"s", [i](SourceContext& context) {
                          std::this_thread::sleep_for(std::chrono::milliseconds(5 * (5 - i)));
