@@ -245,6 +245,8 @@ CMPIInstanceMIFT table(const char* name, CleanUp cleanup) {
 
 }  // namespace
 
+// NOLINTBEGIN(readability-identifier-naming): CMPI has the factories' names
+
 #define EXPORTED extern "C" __attribute__((visibility("default")))
 
 EXPORTED CMPIInstanceMI* TestProvider_Create_InstanceMI(const CMPIBroker* given, const CMPIContext*,
@@ -285,3 +287,5 @@ EXPORTED CMPIInstanceMI* Failing_Create_InstanceMI(const CMPIBroker* given, cons
   CMSetStatusWithChars(given, status, CMPI_RC_ERR_ACCESS_DENIED, "not today");
   return nullptr;
 }
+
+// NOLINTEND(readability-identifier-naming)
