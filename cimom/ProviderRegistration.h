@@ -20,10 +20,10 @@ namespace cimom {
 
 struct ProviderRegistration {
   std::string className;
-  std::string provider;      ///< prefix of the factories: PROVIDER_Create_InstanceMI
-  std::string location;      ///< the library: libLOCATION.so; from a program, also a path
-  bool instance = false;     ///< serves the instance operations
-  bool association = false;  ///< serves the association operations
+  std::string provider;                 ///< prefix of the factories: PROVIDER_Create_InstanceMI
+  std::string location;                 ///< the library: libLOCATION.so; from a program, also a path
+  bool instance = false;                ///< serves the instance operations
+  bool association = false;             ///< serves the association operations
   std::vector<std::string> nameSpaces;  ///< at least one, without a leading slash
   std::string where;                    ///< file and line of the section, for messages
 
