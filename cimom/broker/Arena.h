@@ -38,7 +38,7 @@ class Arena {
   /// Uninitialised memory, aligned for any type. Throws `std::bad_alloc`.
   void* allocate(std::size_t size) {
     const std::size_t rounded = (size + alignment - 1) & ~(alignment - 1);
-    if (rounded < size || static_cast<std::size_t>(end_ - next_) < rounded) {
+    if (rounded < size || next_ == nullptr || static_cast<std::size_t>(end_ - next_) < rounded) {
       return allocateFromNewChunk(size);
     }
     char* const piece = next_;

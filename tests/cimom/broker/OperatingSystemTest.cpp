@@ -1,5 +1,6 @@
 #include "Fixture.h"
 
+#include <pthread.h>
 #include <atomic>
 #include <cerrno>
 #include <chrono>
@@ -56,12 +57,11 @@ TEST_F(OperatingSystemTest, ThreadsCanBeDetachedAndCancelled) {
   while (!ran) {
     xft_.threadSleep(1);
   }
-  static const CMPIBrokerExtFT* table = nullptr;
-  table = &xft_;
+  // Cancelled where it has nothing on its stack: address sanitizers do not follow the way out of more.
   void* const sleeper = xft_.newThread(
       [](void*) -> void* {
         while (true) {
-          table->threadSleep(1);
+          pthread_testcancel();
         }
       },
       nullptr, 0);
