@@ -28,6 +28,16 @@ if(CMPI_INCLUDE_DIR)
   include_directories(BEFORE ${CMAKE_BINARY_DIR}/cmpi-forward)
 endif()
 
+# swinv_optimize_whole(TARGET...): link-time optimisation, where the compiler has it, for what object managers load. Not
+# in sanitized and debug builds.
+include(CheckIPOSupported)
+check_ipo_supported(RESULT SWINV_HAS_IPO OUTPUT SWINV_IPO_OUTPUT LANGUAGES CXX)
+function(swinv_optimize_whole)
+  if(SWINV_HAS_IPO AND NOT SWINV_SANITIZE AND CMAKE_BUILD_TYPE STREQUAL Release)
+    set_target_properties(${ARGN} PROPERTIES INTERPROCEDURAL_OPTIMIZATION ON)
+  endif()
+endfunction()
+
 # swinv_export_only(TARGET FILE): exports what the linker map FILE lists, and nothing else.
 function(swinv_export_only target map)
   target_link_options(${target} PRIVATE LINKER:--version-script=${map})

@@ -72,11 +72,12 @@ constexpr Property instanceProperties[] = {
     {"TargetOSTypes", &SoftwareIdentity::getTargetOSTypes},
 };
 
-/// Sets one property of an instance if its getter has a value. The locals are shared by all properties.
+/// Sets one property of an instance if its getter has a value.
 class PropertySetter {
  public:
-  PropertySetter(const CMPIBroker* broker, CMPIInstance* instance, SoftwareIdentity& source)
-      : broker_(broker), instance_(instance), source_(source) {}
+  PropertySetter(const CMPIBroker* broker, CMPIInstance* instance, SoftwareIdentity& source,
+                 PropertyValues& values)
+      : broker_(broker), instance_(instance), source_(source), values_(values) {}
 
   void set(const Property& property) {
     std::visit([&](auto getter) { setBy(getter, property.name); }, property.getter);
@@ -84,14 +85,14 @@ class PropertySetter {
 
  private:
   void setBy(bool (SoftwareIdentity::*getter)(std::string&), const char* name) {
-    if ((source_.*getter)(text_)) {
-      ProviderUtilities::setProperty(instance_, name, text_);
+    if ((source_.*getter)(values_.text)) {
+      ProviderUtilities::setProperty(instance_, name, values_.text);
     }
   }
 
   void setBy(DateTime dateTime, const char* name) {
-    if ((source_.*dateTime.getter)(text_)) {
-      ProviderUtilities::setProperty(broker_, instance_, name, text_, true);
+    if ((source_.*dateTime.getter)(values_.text)) {
+      ProviderUtilities::setProperty(broker_, instance_, name, values_.text, true);
     }
   }
 
@@ -104,11 +105,11 @@ class PropertySetter {
   }
 
   void setBy(bool (SoftwareIdentity::*getter)(std::vector<unsigned short>&), const char* name) {
-    setArray(getter, name, numbers_);
+    setArray(getter, name, values_.numbers);
   }
 
   void setBy(bool (SoftwareIdentity::*getter)(std::vector<std::string>&), const char* name) {
-    setArray(getter, name, texts_);
+    setArray(getter, name, values_.texts);
   }
 
   template <typename Element>
@@ -123,9 +124,7 @@ class PropertySetter {
   const CMPIBroker* broker_;
   CMPIInstance* instance_;
   SoftwareIdentity& source_;
-  std::string text_;
-  std::vector<unsigned short> numbers_;
-  std::vector<std::string> texts_;
+  PropertyValues& values_;
 };
 
 }  // namespace
@@ -168,7 +167,7 @@ CMPIObjectPath* CMPISoftwareIdentity::getObjectPath() {
   if (path == nullptr) {
     return nullptr;
   }
-  std::string id;
+  std::string& id = values.text;
   if (!softwareIdentity.getInstanceID(id)) {
     return path;
   }
@@ -190,7 +189,7 @@ CMPIInstance* CMPISoftwareIdentity::getCMPIInstance(const char** properties) {
     return nullptr;
   }
 
-  PropertySetter setter(broker, instance, softwareIdentity);
+  PropertySetter setter(broker, instance, softwareIdentity, values);
   for (const Property& property : instanceProperties) {
     setter.set(property);
   }

@@ -10,6 +10,14 @@
 
 namespace Oru::SoftwareInventoryProfileProvider {
 
+/// Where getters put what they find, shared by all properties and kept from one instance to the next, so that
+/// its room is made once for a request.
+struct PropertyValues {
+  std::string text;
+  std::vector<unsigned short> numbers;
+  std::vector<std::string> texts;
+};
+
 /// A cursor like the SoftwareIdentity that it wraps. It belongs to one request on one thread; the broker, the
 /// context and all CMPI objects that it returns are the object manager's.
 class CMPISoftwareIdentity {
@@ -46,6 +54,7 @@ class CMPISoftwareIdentity {
   [[maybe_unused]] const CMPIContext* context;
   std::string nameSpace;
   SoftwareIdentity softwareIdentity;
+  PropertyValues values;
 };
 
 }  // namespace Oru::SoftwareInventoryProfileProvider

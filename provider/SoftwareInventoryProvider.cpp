@@ -45,6 +45,7 @@ CMPIStatus statusOf(CMPIrc code) {
 /// exception ends the dispatch and leaves the status as it was; what was delivered stays delivered.
 template <typename Dispatch>
 CMPIStatus answer(const CMPIObjectPath* path, Dispatch dispatch, CallSite site = CallSite::here()) {
+  beginRequest();
   markProviderEntry(loggerSoftwareInventoryProvider, site.function, site.file, site.line);
   const unsigned short classId = ProviderUtilities::getClassId(path);
   traceVariable({loggerSoftwareInventoryProvider, site}, "classId", classId);
@@ -70,11 +71,13 @@ void walk(const CMPIContext* context, const CMPIResult* result, const CMPIObject
 }
 
 CMPIStatus refuse(CallSite site = CallSite::here()) {
+  beginRequest();
   traceMethod({loggerSoftwareInventoryProvider, site});
   return statusOf(CMPI_RC_ERR_NOT_SUPPORTED);
 }
 
 CMPIStatus acceptCleanup(CallSite site = CallSite::here()) {
+  beginRequest();
   traceMethod({loggerSoftwareInventoryProvider, site});
   return statusOf(CMPI_RC_OK);
 }
@@ -175,6 +178,7 @@ CMPIStatus SoftwareInventory_CreateInstance(CMPIInstanceMI*, const CMPIContext*,
 CMPIStatus SoftwareInventory_ModifyInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*,
                                             const CMPIObjectPath* instancePath, const CMPIInstance* instance,
                                             const char**) {
+  beginRequest();
   CMPIStatus status = statusOf(CMPI_RC_ERR_NOT_SUPPORTED);
   if (instance == nullptr || instance->hdl == nullptr) {
     status.rc = CMPI_RC_ERR_FAILED;

@@ -72,7 +72,7 @@ Index nodeAt(const NodeTree& tree, const std::string& path) {
 }
 
 std::string pathOf(const NodeTree& tree, Index node) {
-  return node == NodeTree::none ? std::string() : agent::pathText(tree.number(node));
+  return node == NodeTree::none ? std::string() : std::string(tree.path(node));
 }
 
 std::string nothingPasses(NodeLexicon::PathType type, const std::string& path) {

@@ -79,6 +79,8 @@ class NodeTree {
   [[nodiscard]] Index subtreeEnd(Index node) const { return nodes_[node].subtreeEnd; }
   /// The nearest computer system at or above `node`, or `none`.
   [[nodiscard]] Index computer(Index node) const { return nodes_[node].computer; }
+  /// The number's path text, as `pathText` writes it. Kept ready, because every published name holds two of them.
+  [[nodiscard]] std::string_view path(Index node) const { return view(nodes_[node].path); }
   [[nodiscard]] std::string_view description(Index node) const { return view(nodes_[node].description); }
   /// What the number was made of, with the type: the node's place on its bus. May be empty (numbers given
   /// outright).
@@ -111,6 +113,7 @@ class NodeTree {
   };
   struct Node {
     NodeNumber number = noNumber;
+    TextRange path;
     Index parent = none;
     Index subtreeEnd = 0;
     Index computer = none;
@@ -212,6 +215,7 @@ class NodeTreeBuilder {
   void placeNodes(NodeTree& tree, const std::vector<Handle>& order, const std::vector<Index>& indexOf) const;
   void placeProperties(NodeTree& tree, const std::vector<Index>& indexOf) const;
   void giveNumbers(NodeTree& tree, const std::vector<Handle>& order, NumberMaker makeNumber) const;
+  static void keepPaths(NodeTree& tree);
 
   std::vector<Draft> drafts_;
   std::vector<PropertyDraft> properties_;

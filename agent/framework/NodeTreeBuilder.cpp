@@ -101,11 +101,12 @@ NodeTree NodeTreeBuilder::build(NumberMaker makeNumber) {
 
   NodeTree tree;
   tree.texts_ = std::move(gathered.texts_);
-  tree.texts_.shrink_to_fit();
   tree.reports_ = std::move(gathered.reports_);
   gathered.placeNodes(tree, order, indexOf);
   gathered.placeProperties(tree, indexOf);
   gathered.giveNumbers(tree, order, makeNumber);
+  keepPaths(tree);
+  tree.texts_.shrink_to_fit();
   tree.indexTypes();
   tree.indexNumbers();
   return tree;
@@ -222,6 +223,14 @@ void NodeTreeBuilder::giveNumbers(NodeTree& tree, const std::vector<Handle>& ord
       ++n;
     }
     tree.nodes_[index].number = makeNumber(tree.type(index), tree.position(index), n);
+  }
+}
+
+void NodeTreeBuilder::keepPaths(NodeTree& tree) {
+  for (NodeTree::Node& node : tree.nodes_) {
+    const std::string path = pathText(node.number);
+    node.path = {static_cast<std::uint32_t>(tree.texts_.size()), static_cast<std::uint32_t>(path.size())};
+    tree.texts_ += path;
   }
 }
 

@@ -28,11 +28,14 @@ class NumberText {
 
 }  // namespace
 
-std::string makeInstanceId(std::string_view parentText, std::string_view nodeText) {
-  const NumberText parent(StreamExtraction(parentText).hexadecimal(), 10);
-  std::string instanceId;
-  instanceId.reserve(parent.view().size() + 1 + nodeText.size());
-  return instanceId.append(parent.view()).append(1, '@').append(nodeText);
+void InstanceIdMaker::make(const std::string& parentText, const std::string& nodeText,
+                           std::string& instanceId) {
+  if (parentText != parentText_) {
+    const NumberText parent(StreamExtraction(parentText).hexadecimal(), 10);
+    prefix_.assign(parent.view()).append(1, '@');
+    parentText_ = parentText;
+  }
+  instanceId.assign(prefix_).append(nodeText);
 }
 
 InstanceIdParts parseInstanceId(std::string_view instanceId) {

@@ -10,9 +10,18 @@
 
 namespace Oru::SoftwareInventoryProfileProvider {
 
-/// The InstanceID of a node, from the path texts of its parent and of itself. A parent text that does not
-/// begin with a hexadecimal number counts as 0.
-std::string makeInstanceId(std::string_view parentText, std::string_view nodeText);
+/// Makes InstanceIDs of nodes one after the other. The number of a parent is worked out once for children in
+/// a row.
+class InstanceIdMaker {
+ public:
+  /// Fills `instanceId`, in the room that it has, from the path texts of a node's parent and of itself. A
+  /// parent text that does not begin with a hexadecimal number counts as 0.
+  void make(const std::string& parentText, const std::string& nodeText, std::string& instanceId);
+
+ private:
+  std::string parentText_;
+  std::string prefix_ = "0@";  ///< what an InstanceID below parentText_ begins with
+};
 
 /// What an InstanceID says, as stream extraction reads it: a decimal number, one character, a word.
 struct InstanceIdParts {

@@ -1,7 +1,7 @@
 #include "Linux/ReleaseDate.h"
 
-#include <charconv>
 #include <cstddef>
+#include <cstring>
 
 namespace Oru::SoftwareInventoryProfileProvider {
 
@@ -43,35 +43,36 @@ bool scanSlash(std::string_view& rest) {
   return true;
 }
 
-/// Appends to a buffer, keeping one character for the end.
-class BoundedText {
+/// Writes the fields of a date one after the other, with room for the longest that each can be.
+class FieldWriter {
  public:
-  explicit BoundedText(DateBuffer& buffer) : buffer_(buffer) { buffer_.fill('\0'); }
-
   void append(std::string_view text) {
-    for (const char character : text) {
-      if (length_ + 1 < buffer_.size()) {
-        buffer_[length_++] = character;
-      }
-    }
+    std::memcpy(end_, text.data(), text.size());
+    end_ += text.size();
   }
 
   /// A number of at least `width` characters, padded on the left.
   void append(unsigned int number, std::size_t width, char padding) {
-    std::array<char, 10> digits{};
-    const char* end = std::to_chars(digits.data(), digits.data() + digits.size(), number).ptr;
-    const std::string_view text(digits.data(), static_cast<std::size_t>(end - digits.data()));
-    for (std::size_t i = text.size(); i < width; ++i) {
-      append(std::string_view(&padding, 1));
+    std::size_t length = 1;
+    for (unsigned int rest = number / 10; rest != 0; rest /= 10) {
+      ++length;
     }
-    append(text);
+    for (; length < width; --width) {
+      *end_++ = padding;
+    }
+    end_ += length;
+    char* at = end_;
+    for (; length != 0; --length) {
+      *--at = static_cast<char>('0' + number % 10);
+      number /= 10;
+    }
   }
 
-  [[nodiscard]] std::size_t length() const { return length_; }
+  [[nodiscard]] std::string_view view() const { return {text_, static_cast<std::size_t>(end_ - text_)}; }
 
  private:
-  DateBuffer& buffer_;
-  std::size_t length_ = 0;
+  char text_[64];  // four numbers of up to 10 digits, and 15 characters between them
+  char* end_ = text_;
 };
 
 }  // namespace
@@ -88,14 +89,27 @@ MonthDayYear scanDate(std::string_view text) {
 std::size_t formatDate(MonthDayYear date, long secondsWest, DateBuffer& buffer) {
   const bool east = secondsWest < 0;
   const long minutes = east ? -(secondsWest / 60) : secondsWest / 60;
-  BoundedText text(buffer);
+  FieldWriter text;
   text.append(date.year, 4, ' ');
   text.append(date.month, 2, '0');
   text.append(date.day, 2, '0');
   text.append("000000.000000");
   text.append(east ? "-" : "+");
   text.append(static_cast<unsigned int>(minutes), 3, '0');
-  return text.length();
+
+  const std::string_view fitting = text.view().substr(0, buffer.size() - 1);
+  std::memcpy(buffer.data(), fitting.data(), fitting.size());
+  buffer[fitting.size()] = '\0';
+  return fitting.size();
+}
+
+std::string_view DateFormatter::format(const std::string& text, long secondsWest) {
+  if (length_ == 0 || secondsWest != secondsWest_ || text != text_) {
+    text_ = text;
+    secondsWest_ = secondsWest;
+    length_ = formatDate(scanDate(text), secondsWest, buffer_);
+  }
+  return {buffer_.data(), length_};
 }
 
 }  // namespace Oru::SoftwareInventoryProfileProvider

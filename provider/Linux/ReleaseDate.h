@@ -2,6 +2,8 @@
 #pragma once
 
 #include <array>
+#include <cstddef>
+#include <string>
 #include <string_view>
 
 namespace Oru::SoftwareInventoryProfileProvider {
@@ -22,5 +24,19 @@ MonthDayYear scanDate(std::string_view text);
 /// room there is. `secondsWest` is the C library's `timezone`; sign and minutes follow it as it stands, west
 /// of UTC positive. Returns the number of characters.
 std::size_t formatDate(MonthDayYear date, long secondsWest, DateBuffer& buffer);
+
+/// Formats dates as the instrumentation has them, one after the other; the same date twice in a row is
+/// formatted once.
+class DateFormatter {
+ public:
+  /// The CIM datetime of a month/day/year text. It lives until the next call.
+  std::string_view format(const std::string& text, long secondsWest);
+
+ private:
+  std::string text_;
+  long secondsWest_ = 0;
+  DateBuffer buffer_{};
+  std::size_t length_ = 0;
+};
 
 }  // namespace Oru::SoftwareInventoryProfileProvider

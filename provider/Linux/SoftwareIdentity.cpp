@@ -5,8 +5,6 @@
 
 #include <ctime>
 
-#include "Linux/InstanceId.h"
-
 namespace Oru::SoftwareInventoryProfileProvider {
 
 namespace {
@@ -201,9 +199,9 @@ bool SoftwareIdentity::getReleaseDate(std::string& releaseDate) {
   if (!instrumentation.getProperty(NodeLexicon::ReleaseDateProperty, releaseDate)) {
     return false;
   }
-  const std::size_t length = formatDate(scanDate(releaseDate), timezone, dateBuffer);
-  releaseDate.assign(dateBuffer.data(), length);
-  return length != 0;
+  const std::string_view formatted = dateBuffer.format(releaseDate, timezone);
+  releaseDate.assign(formatted);
+  return !formatted.empty();
 }
 
 bool SoftwareIdentity::getInstallDate(std::string& installDate) {
@@ -251,7 +249,7 @@ bool SoftwareIdentity::getInstanceID(std::string& instanceId) {
   const TraceScope scope(loggerSoftwareIdentity);
   const std::string parent = instrumentation.convertPathToString(instrumentation.getPathToParentNode());
   const std::string node = instrumentation.convertPathToString(instrumentation.getPathToNode());
-  instanceId = makeInstanceId(parent, node);
+  instanceIds.make(parent, node, instanceId);
   return true;
 }
 

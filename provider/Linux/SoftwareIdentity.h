@@ -7,6 +7,7 @@
 #include <string>
 #include <vector>
 
+#include "Linux/InstanceId.h"
 #include "Linux/ReleaseDate.h"
 
 namespace Oru::SoftwareInventoryProfileProvider {
@@ -125,7 +126,8 @@ class SoftwareIdentity {
   std::vector<Filter> filters;
   std::vector<NodeLexicon::NodeType> nodeTypes;
   std::vector<NodeLexicon::NodeType>::iterator currentNodeType;
-  DateBuffer dateBuffer{};  ///< the last formatted date
+  DateFormatter dateBuffer;  ///< holds the last formatted date
+  InstanceIdMaker instanceIds;
 };
 
 }  // namespace Oru::SoftwareInventoryProfileProvider

@@ -1,24 +1,29 @@
 #include "Linux/StreamExtraction.h"
 
+#include <array>
 #include <limits>
 
 namespace Oru::SoftwareInventoryProfileProvider {
 
 namespace {
 
-constexpr unsigned int noDigit = 16;
+constexpr unsigned char noDigit = 16;
+
+/// The value of each character as a digit, `noDigit` where it is none.
+constexpr std::array<unsigned char, 256> digitValues = [] {
+  std::array<unsigned char, 256> values{};
+  values.fill(noDigit);
+  for (unsigned char i = 0; i < 10; ++i) {
+    values['0' + i] = i;
+  }
+  for (unsigned char i = 0; i < 6; ++i) {
+    values['a' + i] = values['A' + i] = static_cast<unsigned char>(10 + i);
+  }
+  return values;
+}();
 
 constexpr unsigned int digitValue(char character) {
-  if (character >= '0' && character <= '9') {
-    return static_cast<unsigned int>(character - '0');
-  }
-  if (character >= 'a' && character <= 'f') {
-    return static_cast<unsigned int>(character - 'a') + 10;
-  }
-  if (character >= 'A' && character <= 'F') {
-    return static_cast<unsigned int>(character - 'A') + 10;
-  }
-  return noDigit;
+  return digitValues[static_cast<unsigned char>(character)];
 }
 
 constexpr bool isWhiteSpace(char character) {
@@ -55,18 +60,21 @@ std::uint64_t StreamExtraction::number() {
   skipPrefix<base>();
 
   constexpr std::uint64_t max = std::numeric_limits<std::uint64_t>::max();
+  const char* const begin = rest_.data();
+  const char* const end = begin + rest_.size();
+  const char* at = begin;
   std::uint64_t value = 0;
-  bool anyDigit = false;
   bool overflow = false;
-  for (; !rest_.empty(); rest_.remove_prefix(1)) {
-    const unsigned int digit = digitValue(rest_.front());
+  for (; at != end; ++at) {
+    const unsigned int digit = digitValue(*at);
     if (digit >= base) {
       break;
     }
-    anyDigit = true;
-    overflow = overflow || value > (max - digit) / base;
+    overflow = overflow || value > max / base || value * base > max - digit;
     value = value * base + digit;
   }
+  const bool anyDigit = at != begin;
+  rest_.remove_prefix(static_cast<std::size_t>(at - begin));
   failed_ = !anyDigit || overflow;
   if (overflow) {
     return max;

@@ -20,6 +20,7 @@
 #include <ZelLog/ZelLogger.h>
 #include <ZelLog/ZelMessageBuffer.h>
 
+#include <atomic>
 #include <cstdio>
 #include <cstring>
 #include <exception>
@@ -172,13 +173,22 @@ inline bool isOn(ZelLog::ZelChannel channel, int level) {
   return &ZelLog::ZelLogger::isLevelOn == nullptr || ZelLog::ZelLogger::isLevelOn(channel, level);
 }
 
-inline bool isOn(int level) {
-  return isOn(ZelLog::ZelChannel::Log, level) || isOn(ZelLog::ZelChannel::Trace, level);
+/// What the logger said of the routine level when the last request began. Scopes are entered some forty times
+/// for each published instance: they look here, and ask the logger only where a channel takes what they have
+/// to say.
+enum class RoutineEvents : unsigned char { Unknown, Off, On };
+inline std::atomic<RoutineEvents> routineEvents{RoutineEvents::Unknown};
+
+inline bool mayBeOn(int level) {
+  return level < routineLevel || routineEvents.load(std::memory_order_relaxed) != RoutineEvents::Off;
 }
 
 /// Sends the text that `text` makes to each channel that takes the level.
 template <typename Text>
 void emit(const LogPoint& point, int level, Text text) {
+  if (!mayBeOn(level)) {
+    return;
+  }
   if (isOn(ZelLog::ZelChannel::Log, level)) {
     ZelLog::ZelMessageBuffer buffer;
     ZelLog::ZelLogger::logLevelMessage(point.site.function, point.site.file, point.site.line, point.logger,
@@ -191,9 +201,15 @@ void emit(const LogPoint& point, int level, Text text) {
   }
 }
 
-inline void emitEvent(const LogPoint& point, MessageType type) {
-  emit(point, routineLevel,
-       [&] { return trace(point.site.function, point.site.file, point.site.line, type); });
+[[gnu::noinline]] inline void emitEvent(const LogPoint& point, int level, MessageType type) {
+  emit(point, level, [&] { return trace(point.site.function, point.site.file, point.site.line, type); });
+}
+
+[[gnu::noinline]] inline void emitEvent(const LogPoint& point, int level, MessageType type,
+                                        const std::string& parameters) {
+  emit(point, level, [&] {
+    return tracepara(point.site.function, point.site.file, point.site.line, parameters.c_str(), type);
+  });
 }
 
 template <typename Value>
@@ -214,9 +230,18 @@ std::string parameterList(const Values&... values) {
 
 }  // namespace trace_detail
 
+/// Learns from the logger whether routine events are of any use. Every function of the provider interface
+/// begins with it: a change of the level shows from the next request on.
+inline void beginRequest() {
+  using trace_detail::RoutineEvents;
+  const bool on = trace_detail::isOn(ZelLog::ZelChannel::Log, routineLevel) ||
+                  trace_detail::isOn(ZelLog::ZelChannel::Trace, routineLevel);
+  trace_detail::routineEvents.store(on ? RoutineEvents::On : RoutineEvents::Off, std::memory_order_relaxed);
+}
+
 /// One METHOD event, of a function that has no entry and exit worth telling apart.
 inline void traceMethod(const LogPoint& point) {
-  trace_detail::emitEvent(point, METHOD);
+  trace_detail::emitEvent(point, routineLevel, METHOD);
 }
 
 /// One MESSAGE event with a free text.
@@ -248,23 +273,20 @@ class TraceScope {
  public:
   template <typename... Parameters>
   explicit TraceScope(const LogPoint& point, const Parameters&... parameters) : point_(point) {
-    if (!trace_detail::isOn(routineLevel)) {
+    if (!trace_detail::mayBeOn(routineLevel)) {
       return;
     }
     exceptionsAtEntry_ = std::uncaught_exceptions();
     if constexpr (sizeof...(parameters) == 0) {
-      trace_detail::emitEvent(point_, ENTERING);
+      trace_detail::emitEvent(point_, routineLevel, ENTERING);
     } else {
-      trace_detail::emit(point_, routineLevel, [&] {
-        const std::string list = trace_detail::parameterList(parameters...);
-        return tracepara(point_.site.function, point_.site.file, point_.site.line, list.c_str(), ENTERING);
-      });
+      trace_detail::emitEvent(point_, routineLevel, ENTERING, trace_detail::parameterList(parameters...));
     }
   }
 
   ~TraceScope() {
-    if (trace_detail::isOn(routineLevel) && std::uncaught_exceptions() <= exceptionsAtEntry_) {
-      trace_detail::emitEvent(point_, EXITING);
+    if (trace_detail::mayBeOn(routineLevel) && std::uncaught_exceptions() <= exceptionsAtEntry_) {
+      trace_detail::emitEvent(point_, routineLevel, EXITING);
     }
   }
 
@@ -276,18 +298,55 @@ class TraceScope {
   int exceptionsAtEntry_ = 0;
 };
 
+/// The same with the parameters in both events, and at another level where one is given.
+class ParameterScope {
+ public:
+  /// A level for the scope's events.
+  struct Level {
+    int value;
+  };
+
+  template <typename... Parameters>
+  explicit ParameterScope(const LogPoint& point, const Parameters&... parameters)
+      : ParameterScope(point, Level{routineLevel}, parameters...) {}
+
+  template <typename... Parameters>
+  ParameterScope(const LogPoint& point, Level level, const Parameters&... parameters)
+      : point_(point), level_(level.value), exceptionsAtEntry_(std::uncaught_exceptions()) {
+    if (trace_detail::mayBeOn(level_)) {
+      parameters_ = trace_detail::parameterList(parameters...);
+      trace_detail::emitEvent(point_, level_, ENTERING, parameters_);
+    }
+  }
+
+  ~ParameterScope() {
+    if (trace_detail::mayBeOn(level_) && std::uncaught_exceptions() <= exceptionsAtEntry_) {
+      trace_detail::emitEvent(point_, level_, EXITING, parameters_);
+    }
+  }
+
+  ParameterScope(const ParameterScope&) = delete;
+  ParameterScope& operator=(const ParameterScope&) = delete;
+
+ private:
+  LogPoint point_;
+  int level_;
+  int exceptionsAtEntry_;
+  std::string parameters_;
+};
+
 /// The banner at the start of every function of the provider interface that does real work: the separator
 /// line, as this helper's own event, then ENTERING for the function.
 inline void markProviderEntry(const std::string& logger, const char* function = __builtin_FUNCTION(),
                               const char* file = __builtin_FILE(), unsigned int line = __builtin_LINE()) {
   trace_detail::emit(logger, routineLevel, [] { return traceSeparator; });
-  trace_detail::emitEvent(LogPoint(logger, {function, file, line}), ENTERING);
+  trace_detail::emitEvent(LogPoint(logger, {function, file, line}), routineLevel, ENTERING);
 }
 
 /// Its mirror at the end: EXITING, then the separator line.
 inline void markProviderExit(const std::string& logger, const char* function = __builtin_FUNCTION(),
                              const char* file = __builtin_FILE(), unsigned int line = __builtin_LINE()) {
-  trace_detail::emitEvent(LogPoint(logger, {function, file, line}), EXITING);
+  trace_detail::emitEvent(LogPoint(logger, {function, file, line}), routineLevel, EXITING);
   trace_detail::emit(logger, routineLevel, [] { return traceSeparator; });
 }
 

@@ -3,9 +3,24 @@
 
 namespace {
 
-using Oru::SoftwareInventoryProfileProvider::makeInstanceId;
+using Oru::SoftwareInventoryProfileProvider::InstanceIdMaker;
 using Oru::SoftwareInventoryProfileProvider::parentPathText;
 using Oru::SoftwareInventoryProfileProvider::parseInstanceId;
+
+std::string makeInstanceId(const std::string& parentText, const std::string& nodeText) {
+  std::string instanceId = "what was there before is replaced";
+  InstanceIdMaker().make(parentText, nodeText, instanceId);
+  return instanceId;
+}
+
+TEST(InstanceId, ChildrenInARowAreMadeAsEachAlone) {
+  InstanceIdMaker maker;
+  std::string instanceId;
+  for (const char* parent : {"", "1a", "1a", "", "xyz", "ff", "1a"}) {
+    maker.make(parent, "f", instanceId);
+    EXPECT_EQ(instanceId, makeInstanceId(parent, "f"));
+  }
+}
 
 TEST(InstanceId, IsTheParentsNumberInDecimalAndTheNodesText) {
   EXPECT_EQ(makeInstanceId("1a", "xyz"), "26@xyz");

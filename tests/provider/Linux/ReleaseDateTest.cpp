@@ -56,6 +56,15 @@ TEST(ReleaseDate, AYearAboveFourDigitsIsCutToTheBuffer) {
   EXPECT_EQ(format({~0U, ~0U, ~0U}, 0).size(), 25U);
 }
 
+TEST(ReleaseDate, DatesInARowAreFormattedAsEachAlone) {
+  Oru::SoftwareInventoryProfileProvider::DateFormatter formatter;
+  for (const char* text : {"", "12/31/2010", "12/31/2010", "01/02/2024", ""}) {
+    for (const long west : {0L, 18000L, 18000L, 0L}) {
+      EXPECT_EQ(formatter.format(text, west), format(scanDate(text), west));
+    }
+  }
+}
+
 TEST(ReleaseDate, MinutesTruncateTowardZero) {
   EXPECT_EQ(format({1, 1, 2024}, 119), "20240101000000.000000+001");
   EXPECT_EQ(format({1, 1, 2024}, -119), "20240101000000.000000-001");
