@@ -5,6 +5,7 @@
 #include <cmpi/cmpift.h>
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <string>
 #include <vector>
 
@@ -39,6 +40,17 @@ class ProviderTest : public testing::Test {
   std::string property(std::size_t instance, const std::string& name) const;
   /// The texts logged at a level, to one channel.
   std::vector<std::string> texts(int level, bool trace = false) const;
+  /// Forgets what happened and makes the first such call of the next request fail; `ask` is that request.
+  template <typename Ask>
+  void failFirst(const std::string& call, Ask ask) {
+    world.forget();
+    ask();
+    const auto found = std::find(world.calls.begin(), world.calls.end(), call);
+    ASSERT_NE(found, world.calls.end()) << call;
+    const auto number = static_cast<std::size_t>(found - world.calls.begin()) + 1;
+    world.forget();
+    world.failAt = number;
+  }
   std::size_t countCalls(const std::string& call) const;
 
   standin::World& world;

@@ -1,6 +1,9 @@
 #include <Linux/InstanceId.h>
 #include <gtest/gtest.h>
 
+#include <sstream>
+#include <string>
+
 namespace {
 
 using Oru::SoftwareInventoryProfileProvider::InstanceIdMaker;
@@ -26,6 +29,22 @@ TEST(InstanceId, IsTheParentsNumberInDecimalAndTheNodesText) {
   EXPECT_EQ(makeInstanceId("1a", "xyz"), "26@xyz");
   EXPECT_EQ(makeInstanceId("FFFFFFFFFFFFFFFF", "f"), "18446744073709551615@f");
   EXPECT_EQ(makeInstanceId("0001a", "01"), "26@01");
+}
+
+TEST(InstanceId, TextsOfEveryLengthGoTogether) {
+  // In every order of lengths, because the text that an InstanceID replaces may be longer or shorter.
+  const std::string digits = "fedcba9876543210";
+  InstanceIdMaker maker;
+  std::string instanceId;
+  for (std::size_t i = 0; i < 17 * 18; ++i) {
+    const std::string parent = digits.substr(0, i * 5 % 17);
+    const std::string node = std::string("0123456789abcdefg").substr(0, i * 7 % 18);
+    std::uint64_t number = 0;
+    std::istringstream(parent) >> std::hex >> number;
+    maker.make(parent, node, instanceId);
+    EXPECT_EQ(instanceId, std::to_string(number) + "@" + node);
+    EXPECT_EQ(instanceId.c_str()[instanceId.size()], '\0');
+  }
 }
 
 TEST(InstanceId, AParentTextWithoutHexadecimalDigitsCountsAsZero) {

@@ -1,0 +1,1 @@
+// Nothing: this program is where the compiled headers of the tests are kept (tests/CMakeLists.txt).
