@@ -3,8 +3,8 @@
 #include <Oru/ProviderUtilities.h>
 #include <Trace.h>
 
+#include <tuple>
 #include <utility>
-#include <variant>
 
 namespace Oru::SoftwareInventoryProfileProvider {
 
@@ -20,56 +20,58 @@ struct DateTime {
   bool (SoftwareIdentity::*getter)(std::string&);
 };
 
-using Getter = std::variant<bool (SoftwareIdentity::*)(std::string&), DateTime,
-                            bool (SoftwareIdentity::*)(unsigned short&), bool (SoftwareIdentity::*)(bool&),
-                            bool (SoftwareIdentity::*)(std::vector<unsigned short>&),
-                            bool (SoftwareIdentity::*)(std::vector<std::string>&)>;
-
+template <typename Getter>
 struct Property {
   const char* name;
   Getter getter;
 };
 
 /// What an instance carries, in the order in which it is set. Properties whose getters have nothing today
-/// stay in the sequence: a getter that learns its value publishes it.
-constexpr Property instanceProperties[] = {
-    {"Caption", &SoftwareIdentity::getCaption},
-    {"Description", &SoftwareIdentity::getDescription},
-    {"ElementName", &SoftwareIdentity::getElementName},
-    {"InstallDate", DateTime{&SoftwareIdentity::getInstallDate}},
-    {"Name", &SoftwareIdentity::getName},
-    {"OperationalStatus", &SoftwareIdentity::getOperationalStatus},
-    {"StatusDescriptions", &SoftwareIdentity::getStatusDescriptions},
-    {"HealthState", &SoftwareIdentity::getHealthState},
-    {"PrimaryStatus", &SoftwareIdentity::getPrimaryStatus},
-    {"DetailedStatus", &SoftwareIdentity::getDetailedStatus},
-    {"OperatingStatus", &SoftwareIdentity::getOperatingStatus},
-    {"CommunicationStatus", &SoftwareIdentity::getCommunicationStatus},
-    {"InstanceID", &SoftwareIdentity::getInstanceID},
-    {"MajorVersion", &SoftwareIdentity::getMajorVersion},
-    {"MinorVersion", &SoftwareIdentity::getMinorVersion},
-    {"RevisionNumber", &SoftwareIdentity::getRevisionNumber},
-    {"BuildNumber", &SoftwareIdentity::getBuildNumber},
-    {"VersionString", &SoftwareIdentity::getVersionString},
-    {"BuildID", &SoftwareIdentity::getBuildId},
-    {"TargetOperatingSystems", &SoftwareIdentity::getTargetOperatingSystems},
-    {"Manufacturer", &SoftwareIdentity::getManufacturer},
-    {"Languages", &SoftwareIdentity::getLanguages},
-    {"Classifications", &SoftwareIdentity::getClassifications},
-    {"ClassificationDescriptions", &SoftwareIdentity::getClassificationDescriptions},
-    {"SerialNumber", &SoftwareIdentity::getSerialNumber},
-    {"TargetTypes", &SoftwareIdentity::getTargetTypes},
-    {"IdentityInfoValue", &SoftwareIdentity::getIdentityInfoValue},
-    {"IdentityInfoType", &SoftwareIdentity::getIdentityInfoType},
-    {"ReleaseDate", DateTime{&SoftwareIdentity::getReleaseDate}},
-    {"IsEntity", &SoftwareIdentity::isEntity},
-    {"ExtendedResourceType", &SoftwareIdentity::getExtendedResourceType},
-    {"OtherExtendedResourceTypeDescription", &SoftwareIdentity::getOtherExtendedResourceTypeDescription},
-    {"MinExtendedResourceTypeMajorVersion", &SoftwareIdentity::getMinExtendedResourceTypeMajorVersion},
-    {"MinExtendedResourceTypeMinorVersion", &SoftwareIdentity::getMinExtendedResourceTypeMinorVersion},
-    {"MinExtendedResourceTypeRevisionNumber", &SoftwareIdentity::getMinExtendedResourceTypeRevisionNumber},
-    {"MinExtendedResourceTypeBuildNumber", &SoftwareIdentity::getMinExtendedResourceTypeBuildNumber},
-    {"TargetOSTypes", &SoftwareIdentity::getTargetOSTypes},
+/// stay in the sequence: a getter that learns its value publishes it. A tuple, so that each getter is known
+/// where it is called: most are nothing but a trace scope, which the compiler then puts in the place of the
+/// call.
+constexpr std::tuple instanceProperties{
+    Property{"Caption", &SoftwareIdentity::getCaption},
+    Property{"Description", &SoftwareIdentity::getDescription},
+    Property{"ElementName", &SoftwareIdentity::getElementName},
+    Property{"InstallDate", DateTime{&SoftwareIdentity::getInstallDate}},
+    Property{"Name", &SoftwareIdentity::getName},
+    Property{"OperationalStatus", &SoftwareIdentity::getOperationalStatus},
+    Property{"StatusDescriptions", &SoftwareIdentity::getStatusDescriptions},
+    Property{"HealthState", &SoftwareIdentity::getHealthState},
+    Property{"PrimaryStatus", &SoftwareIdentity::getPrimaryStatus},
+    Property{"DetailedStatus", &SoftwareIdentity::getDetailedStatus},
+    Property{"OperatingStatus", &SoftwareIdentity::getOperatingStatus},
+    Property{"CommunicationStatus", &SoftwareIdentity::getCommunicationStatus},
+    Property{"InstanceID", &SoftwareIdentity::getInstanceID},
+    Property{"MajorVersion", &SoftwareIdentity::getMajorVersion},
+    Property{"MinorVersion", &SoftwareIdentity::getMinorVersion},
+    Property{"RevisionNumber", &SoftwareIdentity::getRevisionNumber},
+    Property{"BuildNumber", &SoftwareIdentity::getBuildNumber},
+    Property{"VersionString", &SoftwareIdentity::getVersionString},
+    Property{"BuildID", &SoftwareIdentity::getBuildId},
+    Property{"TargetOperatingSystems", &SoftwareIdentity::getTargetOperatingSystems},
+    Property{"Manufacturer", &SoftwareIdentity::getManufacturer},
+    Property{"Languages", &SoftwareIdentity::getLanguages},
+    Property{"Classifications", &SoftwareIdentity::getClassifications},
+    Property{"ClassificationDescriptions", &SoftwareIdentity::getClassificationDescriptions},
+    Property{"SerialNumber", &SoftwareIdentity::getSerialNumber},
+    Property{"TargetTypes", &SoftwareIdentity::getTargetTypes},
+    Property{"IdentityInfoValue", &SoftwareIdentity::getIdentityInfoValue},
+    Property{"IdentityInfoType", &SoftwareIdentity::getIdentityInfoType},
+    Property{"ReleaseDate", DateTime{&SoftwareIdentity::getReleaseDate}},
+    Property{"IsEntity", &SoftwareIdentity::isEntity},
+    Property{"ExtendedResourceType", &SoftwareIdentity::getExtendedResourceType},
+    Property{"OtherExtendedResourceTypeDescription",
+             &SoftwareIdentity::getOtherExtendedResourceTypeDescription},
+    Property{"MinExtendedResourceTypeMajorVersion",
+             &SoftwareIdentity::getMinExtendedResourceTypeMajorVersion},
+    Property{"MinExtendedResourceTypeMinorVersion",
+             &SoftwareIdentity::getMinExtendedResourceTypeMinorVersion},
+    Property{"MinExtendedResourceTypeRevisionNumber",
+             &SoftwareIdentity::getMinExtendedResourceTypeRevisionNumber},
+    Property{"MinExtendedResourceTypeBuildNumber", &SoftwareIdentity::getMinExtendedResourceTypeBuildNumber},
+    Property{"TargetOSTypes", &SoftwareIdentity::getTargetOSTypes},
 };
 
 /// Sets one property of an instance if its getter has a value.
@@ -79,8 +81,9 @@ class PropertySetter {
                  PropertyValues& values)
       : broker_(broker), instance_(instance), source_(source), values_(values) {}
 
-  void set(const Property& property) {
-    std::visit([&](auto getter) { setBy(getter, property.name); }, property.getter);
+  template <typename Getter>
+  void set(const Property<Getter>& property) {
+    setBy(property.getter, property.name);
   }
 
  private:
@@ -178,7 +181,7 @@ CMPIObjectPath* CMPISoftwareIdentity::getObjectPath() {
   return path;
 }
 
-CMPIInstance* CMPISoftwareIdentity::getCMPIInstance(const char** properties) {
+[[gnu::flatten]] CMPIInstance* CMPISoftwareIdentity::getCMPIInstance(const char** properties) {
   const TraceScope scope(loggerCMPISoftwareIdentity, " properties=", static_cast<const void*>(properties));
   CMPIObjectPath* path = getObjectPath();
   if (path == nullptr) {
@@ -190,9 +193,7 @@ CMPIInstance* CMPISoftwareIdentity::getCMPIInstance(const char** properties) {
   }
 
   PropertySetter setter(broker, instance, softwareIdentity, values);
-  for (const Property& property : instanceProperties) {
-    setter.set(property);
-  }
+  std::apply([&](const auto&... property) { (setter.set(property), ...); }, instanceProperties);
   return instance;
 }
 

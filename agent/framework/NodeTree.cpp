@@ -7,30 +7,6 @@
 
 namespace agent {
 
-const NodeTree::Property* NodeTree::findProperty(Index node, int property) const {
-  const Property* begin = properties_.data() + nodes_[node].firstProperty;
-  const Property* end = begin + nodes_[node].propertyCount;
-  // A node has a handful of properties: looking at each is faster than halving.
-  const Property* found = std::find_if(begin, end, [property](const Property& at) { return at.id >= property; });
-  return found != end && found->id == property ? found : nullptr;
-}
-
-std::optional<std::string_view> NodeTree::text(Index node, int property) const {
-  const Property* found = findProperty(node, property);
-  if (found == nullptr || found->isText == 0) {
-    return std::nullopt;
-  }
-  return view(found->textOrNumber);
-}
-
-std::optional<std::uint32_t> NodeTree::value(Index node, int property) const {
-  const Property* found = findProperty(node, property);
-  if (found == nullptr || found->isText != 0) {
-    return std::nullopt;
-  }
-  return found->textOrNumber.begin;
-}
-
 std::vector<PropertyView> NodeTree::properties(Index node) const {
   std::vector<PropertyView> all;
   all.reserve(nodes_[node].propertyCount);

@@ -79,7 +79,8 @@ class NodeTree {
   [[nodiscard]] Index subtreeEnd(Index node) const { return nodes_[node].subtreeEnd; }
   /// The nearest computer system at or above `node`, or `none`.
   [[nodiscard]] Index computer(Index node) const { return nodes_[node].computer; }
-  /// The number's path text, as `pathText` writes it. Kept ready, because every published name holds two of them.
+  /// The number's path text, as `pathText` writes it, with a NUL behind it. Kept ready, because every
+  /// published name holds two of them.
   [[nodiscard]] std::string_view path(Index node) const { return view(nodes_[node].path); }
   [[nodiscard]] std::string_view description(Index node) const { return view(nodes_[node].description); }
   /// What the number was made of, with the type: the node's place on its bus. May be empty (numbers given
@@ -153,6 +154,34 @@ class NodeTree {
   int bucketShift_ = 63;
   std::vector<SourceReport> reports_;
 };
+
+// Short, and called for every published property: in sight of their callers.
+
+inline const NodeTree::Property* NodeTree::findProperty(Index node, int property) const {
+  const Property* at = properties_.data() + nodes_[node].firstProperty;
+  const Property* const end = at + nodes_[node].propertyCount;
+  // A node has a handful of properties: looking at each is faster than halving.
+  while (at != end && at->id < property) {
+    ++at;
+  }
+  return at != end && at->id == property ? at : nullptr;
+}
+
+inline std::optional<std::string_view> NodeTree::text(Index node, int property) const {
+  const Property* found = findProperty(node, property);
+  if (found == nullptr || found->isText == 0) {
+    return std::nullopt;
+  }
+  return view(found->textOrNumber);
+}
+
+inline std::optional<std::uint32_t> NodeTree::value(Index node, int property) const {
+  const Property* found = findProperty(node, property);
+  if (found == nullptr || found->isText != 0) {
+    return std::nullopt;
+  }
+  return found->textOrNumber.begin;
+}
 
 /// Two nodes of a tree were given the same number, or one the number 0 or 2^64-1.
 class DuplicateNumber : public std::runtime_error {

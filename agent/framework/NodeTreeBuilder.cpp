@@ -230,7 +230,7 @@ void NodeTreeBuilder::keepPaths(NodeTree& tree) {
   for (NodeTree::Node& node : tree.nodes_) {
     const std::string path = pathText(node.number);
     node.path = {static_cast<std::uint32_t>(tree.texts_.size()), static_cast<std::uint32_t>(path.size())};
-    tree.texts_ += path;
+    tree.texts_.append(path.c_str(), path.size() + 1);
   }
 }
 

@@ -1,41 +1,41 @@
 #include "Linux/InstanceId.h"
 
-#include <array>
 #include <charconv>
+#include <cstring>
+#include <tuple>
 
+#include "Linux/Digits.h"
 #include "Linux/StreamExtraction.h"
 
 namespace Oru::SoftwareInventoryProfileProvider {
 
-namespace {
-
-/// Digits of a 64-bit number in some base, without a string of its own.
-class NumberText {
- public:
-  NumberText(std::uint64_t number, int base)
-      : end_(std::to_chars(digits_.data(), digits_.data() + digits_.size(), number, base).ptr) {}
-  NumberText(const NumberText&) = delete;
-  NumberText& operator=(const NumberText&) = delete;
-
-  [[nodiscard]] std::string_view view() const {
-    return {digits_.data(), static_cast<std::size_t>(end_ - digits_.data())};
-  }
-
- private:
-  std::array<char, 20> digits_{};
-  const char* end_;
-};
-
-}  // namespace
+void InstanceIdMaker::beginWith(const std::string& parentText) {
+  const auto digits = numberOfHexadecimalDigits(parentText);
+  const DecimalText number(digits ? *digits : StreamExtraction(parentText).hexadecimal());
+  prefixLength_ = number.view().copy(prefix_.data(), prefix_.size() - 1);
+  prefix_[prefixLength_++] = '@';
+  parentText_ = parentText;
+}
 
 void InstanceIdMaker::make(const std::string& parentText, const std::string& nodeText,
                            std::string& instanceId) {
   if (parentText != parentText_) {
-    const NumberText parent(StreamExtraction(parentText).hexadecimal(), 10);
-    prefix_.assign(parent.view()).append(1, '@');
-    parentText_ = parentText;
+    beginWith(parentText);
   }
-  instanceId.assign(prefix_).append(nodeText);
+  // Nearly all node texts are of this length, and so are nearly all InstanceIDs of what went before: pieces
+  // of known lengths, the node's with its NUL, are put in place without a call.
+  constexpr std::size_t usualLength = 15;
+  if (nodeText.size() != usualLength) {
+    instanceId.assign(prefix_.data(), prefixLength_).append(nodeText);
+    return;
+  }
+  instanceId.resize(prefixLength_ + usualLength);
+  if (prefixLength_ <= 16) {
+    std::memcpy(instanceId.data(), prefix_.data(), 16);
+  } else {
+    std::memcpy(instanceId.data(), prefix_.data(), prefix_.size());
+  }
+  std::memcpy(instanceId.data() + prefixLength_, nodeText.data(), usualLength + 1);
 }
 
 InstanceIdParts parseInstanceId(std::string_view instanceId) {
@@ -46,7 +46,10 @@ InstanceIdParts parseInstanceId(std::string_view instanceId) {
 }
 
 std::string parentPathText(std::string_view identifier) {
-  return std::string(NumberText(StreamExtraction(identifier).decimal(), 16).view());
+  std::array<char, 16> digits{};
+  const std::uint64_t number = StreamExtraction(identifier).decimal();
+  char* const end = std::to_chars(digits.data(), digits.data() + digits.size(), number, 16).ptr;
+  return std::string(digits.data(), end);
 }
 
 }  // namespace Oru::SoftwareInventoryProfileProvider

@@ -4,6 +4,8 @@
 // software below that parent.
 #pragma once
 
+#include <array>
+#include <cstddef>
 #include <cstdint>
 #include <string>
 #include <string_view>
@@ -19,8 +21,11 @@ class InstanceIdMaker {
   void make(const std::string& parentText, const std::string& nodeText, std::string& instanceId);
 
  private:
+  void beginWith(const std::string& parentText);
+
   std::string parentText_;
-  std::string prefix_ = "0@";  ///< what an InstanceID below parentText_ begins with
+  std::array<char, 24> prefix_{'0', '@'};  ///< what an InstanceID below parentText_ begins with
+  std::size_t prefixLength_ = 2;
 };
 
 /// What an InstanceID says, as stream extraction reads it: a decimal number, one character, a word.

@@ -201,12 +201,13 @@ void emit(const LogPoint& point, int level, Text text) {
   }
 }
 
-[[gnu::noinline]] inline void emitEvent(const LogPoint& point, int level, MessageType type) {
+// The point comes by value: a scope whose own copy is seen by nobody takes no memory while nothing is traced.
+[[gnu::noinline, gnu::cold]] inline void emitEvent(LogPoint point, int level, MessageType type) {
   emit(point, level, [&] { return trace(point.site.function, point.site.file, point.site.line, type); });
 }
 
-[[gnu::noinline]] inline void emitEvent(const LogPoint& point, int level, MessageType type,
-                                        const std::string& parameters) {
+[[gnu::noinline, gnu::cold]] inline void emitEvent(LogPoint point, int level, MessageType type,
+                                                   const std::string& parameters) {
   emit(point, level, [&] {
     return tracepara(point.site.function, point.site.file, point.site.line, parameters.c_str(), type);
   });
@@ -268,25 +269,21 @@ inline void traceVariable(const LogPoint& point, const char* name, int value) {
 
 /// Entry and exit of a function: ENTERING, with the parameters where there are any, when it is made; EXITING
 /// when the function returns. A function that is left by an exception has no exit event: the trace shows how
-/// deep it came from. Both events name the line of the scope.
+/// deep it came from. Both events name the line of the scope. An entry that went nowhere has no exit either,
+/// so that a scope asks once: nearly all there is to a getter without a value is its scope.
 class TraceScope {
  public:
   template <typename... Parameters>
   explicit TraceScope(const LogPoint& point, const Parameters&... parameters) : point_(point) {
-    if (!trace_detail::mayBeOn(routineLevel)) {
-      return;
-    }
-    exceptionsAtEntry_ = std::uncaught_exceptions();
-    if constexpr (sizeof...(parameters) == 0) {
-      trace_detail::emitEvent(point_, routineLevel, ENTERING);
-    } else {
-      trace_detail::emitEvent(point_, routineLevel, ENTERING, trace_detail::parameterList(parameters...));
+    if (trace_detail::mayBeOn(routineLevel)) [[unlikely]] {
+      exceptionsAtEntry_ = std::uncaught_exceptions();
+      enter(point, parameters...);
     }
   }
 
   ~TraceScope() {
-    if (trace_detail::mayBeOn(routineLevel) && std::uncaught_exceptions() <= exceptionsAtEntry_) {
-      trace_detail::emitEvent(point_, routineLevel, EXITING);
+    if (exceptionsAtEntry_ != notTraced) [[unlikely]] {
+      leave(point_, exceptionsAtEntry_);
     }
   }
 
@@ -294,8 +291,23 @@ class TraceScope {
   TraceScope& operator=(const TraceScope&) = delete;
 
  private:
+  static constexpr int notTraced = -1;
+
+  static void enter(LogPoint point) { trace_detail::emitEvent(point, routineLevel, ENTERING); }
+
+  template <typename... Parameters>
+  [[gnu::noinline, gnu::cold]] static void enter(LogPoint point, const Parameters&... parameters) {
+    trace_detail::emitEvent(point, routineLevel, ENTERING, trace_detail::parameterList(parameters...));
+  }
+
+  [[gnu::noinline, gnu::cold]] static void leave(LogPoint point, int exceptionsAtEntry) {
+    if (std::uncaught_exceptions() <= exceptionsAtEntry) {
+      trace_detail::emitEvent(point, routineLevel, EXITING);
+    }
+  }
+
   LogPoint point_;
-  int exceptionsAtEntry_ = 0;
+  int exceptionsAtEntry_ = notTraced;
 };
 
 /// The same with the parameters in both events, and at another level where one is given.

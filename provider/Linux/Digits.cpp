@@ -1,0 +1,102 @@
+#include "Linux/Digits.h"
+
+#include <bit>
+#include <cstring>
+
+namespace Oru::SoftwareInventoryProfileProvider {
+
+namespace {
+
+/// A word with `byte` in each of its eight bytes. Words hold eight characters, the first in the least
+/// significant byte.
+constexpr std::uint64_t inEachByte(unsigned char byte) {
+  return byte * std::uint64_t{0x0101010101010101};
+}
+
+constexpr std::uint64_t highBits = inEachByte(0x80);
+
+constexpr std::uint64_t firstCharacterLowest(std::uint64_t word) {
+  return std::endian::native == std::endian::big ? __builtin_bswap64(word) : word;
+}
+
+std::uint64_t load(const char* characters) {
+  std::uint64_t word = 0;
+  std::memcpy(&word, characters, sizeof word);
+  return firstCharacterLowest(word);
+}
+
+void store(char* characters, std::uint64_t word) {
+  word = firstCharacterLowest(word);
+  std::memcpy(characters, &word, sizeof word);
+}
+
+/// The high bit of each byte that lies in [first, last]. All must be below 0x80, so that no sum carries into
+/// the next byte.
+constexpr std::uint64_t inRange(std::uint64_t word, unsigned char first, unsigned char last) {
+  return (word + inEachByte(static_cast<unsigned char>(0x80 - first))) &
+         ~(word + inEachByte(static_cast<unsigned char>(0x7f - last))) & highBits;
+}
+
+constexpr bool areHexadecimal(std::uint64_t word) {
+  if ((word & highBits) != 0) {
+    return false;
+  }
+  return (inRange(word, '0', '9') | inRange(word | inEachByte(0x20), 'a', 'f')) == highBits;
+}
+
+/// The number of eight characters that are hexadecimal digits.
+constexpr std::uint64_t hexadecimalNumber(std::uint64_t word) {
+  // Letters, which alone have bit 6, count on from 9 in their low bits.
+  const std::uint64_t letters = (word >> 6U) & inEachByte(1);
+  std::uint64_t digits = __builtin_bswap64((word & inEachByte(0x0f)) + letters * 9);
+  digits = (digits | (digits >> 4U)) & 0x00FF00FF00FF00FFU;
+  digits = (digits | (digits >> 8U)) & 0x0000FFFF0000FFFFU;
+  return (digits | (digits >> 16U)) & 0xFFFFFFFFU;
+}
+
+/// The eight decimal digits of a number below 10^8. It is halved into fours, twos and ones, all halves of a
+/// step at once; the divisions by 100 and 10 are multiplications that are exact for what a half can be.
+constexpr std::uint64_t decimalDigits(std::uint64_t number) {
+  const std::uint64_t upper = number / 10000;
+  const std::uint64_t fours = upper | ((number - upper * 10000) << 32U);
+  const std::uint64_t hundreds = ((fours * 10486) >> 20U) & 0x0000007F0000007FU;
+  const std::uint64_t twos = hundreds | ((fours - hundreds * 100) << 16U);
+  const std::uint64_t tens = ((twos * 103) >> 10U) & 0x000F000F000F000FU;
+  return (tens | ((twos - tens * 10) << 8U)) + inEachByte('0');
+}
+
+}  // namespace
+
+std::optional<std::uint64_t> numberOfHexadecimalDigits(std::string_view text) {
+  if (text.size() < 8 || text.size() > 16) {
+    return std::nullopt;
+  }
+  // Where the first eight and the last eight digits overlap, they are the same.
+  const std::uint64_t first = load(text.data());
+  const std::uint64_t last = load(text.data() + text.size() - 8);
+  if (!areHexadecimal(first) || !areHexadecimal(last)) {
+    return std::nullopt;
+  }
+  return (hexadecimalNumber(first) << (4 * (text.size() - 8))) | hexadecimalNumber(last);
+}
+
+DecimalText::DecimalText(std::uint64_t number) {
+  constexpr std::uint64_t eightDigits = 100'000'000;
+  const std::uint64_t upper = number / eightDigits;
+  const std::array words{decimalDigits(upper / eightDigits), decimalDigits(upper % eightDigits),
+                         decimalDigits(number % eightDigits)};
+  for (std::size_t i = 0; i < words.size(); ++i) {
+    store(digits_.data() + 8 * i, words[i]);
+  }
+  begin_ = 0;
+  for (const std::uint64_t word : words) {
+    if (const std::uint64_t values = word - inEachByte('0'); values != 0) {
+      begin_ += static_cast<std::size_t>(std::countr_zero(values)) / 8;
+      return;
+    }
+    begin_ += 8;
+  }
+  begin_ = digits_.size() - 1;  // 0 has a digit, too
+}
+
+}  // namespace Oru::SoftwareInventoryProfileProvider
