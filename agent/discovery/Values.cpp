@@ -1,4 +1,5 @@
 #include <agent/discovery/Values.h>
+#include <agent/framework/Case.h>
 #include <agent/framework/NodeTree.h>
 
 #include <algorithm>
@@ -7,14 +8,6 @@
 #include <utility>
 
 namespace agent::discovery {
-
-namespace {
-
-char lower(char c) {
-  return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c;
-}
-
-}  // namespace
 
 std::optional<std::string> meaningful(std::string_view text) {
   // What board makers and drivers leave in place of a value, in lower case.

@@ -4,6 +4,8 @@
 // answer and a status other than OK read as "not there".
 #pragma once
 
+#include <agent/framework/Case.h>
+
 #include <cmpi/cmpidt.h>
 #include <cmpi/cmpift.h>
 
@@ -12,10 +14,6 @@
 #include <string_view>
 
 namespace agent::cmpi {
-
-constexpr char lower(char c) {
-  return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c;
-}
 
 /// CIM names are compared without case, whatever the locale of the process.
 inline bool sameName(std::string_view left, std::string_view right) {
