@@ -85,6 +85,7 @@ NetworkInterface readInterface(SourceContext& context, const std::string& name) 
   interface.port = portNumber(numberIfAny(context, folder + "/dev_port", highestPort),
                               numberIfAny(context, folder + "/dev_id", highestPort));
   interface.physicalName = context.textIfAny(folder + "/phys_port_name");
+  interface.hardwareAddress = context.textIfAny(folder + "/address");
   interface.index = numberIfAny(context, folder + "/ifindex", highestIndex).value_or(0);
   return interface;
 }
@@ -109,8 +110,8 @@ InterfacesByDevice findInterfaces(SourceContext& context) {
 std::vector<std::string> sortAndIdentify(const std::string& address,
                                          std::vector<NetworkInterface>& interfaces) {
   std::sort(interfaces.begin(), interfaces.end(), [](const auto& left, const auto& right) {
-    return std::tie(left.port, left.physicalName, left.index, left.name) <
-           std::tie(right.port, right.physicalName, right.index, right.name);
+    return std::tie(left.port, left.physicalName, left.hardwareAddress, left.index, left.name) <
+           std::tie(right.port, right.physicalName, right.hardwareAddress, right.index, right.name);
   });
   std::vector<std::string> identifiers;
   std::map<std::string, int> taken;

@@ -19,7 +19,9 @@ struct NetworkInterface {
   std::uint32_t port = 1;  ///< its port of the device, counted from 1
   /// sys/class/net/NAME/phys_port_name, where the driver gives one: "p0", "pf0vf1".
   std::optional<std::string> physicalName;
-  std::uint32_t index = 0;  ///< the kernel's number of the interface
+  /// sys/class/net/NAME/address: "02:00:5e:10:00:01".
+  std::optional<std::string> hardwareAddress;
+  std::uint32_t index = 0;  ///< the kernel's number of the interface, in the order of making
 };
 
 /// By the bus address of the device: "0000:3b:00.0" on PCI, "BUS:ADDRESS" elsewhere, such as "usb:1-1.4:1.0".
@@ -32,7 +34,8 @@ InterfacesByDevice findInterfaces(SourceContext& context);
 /// The port identifiers of one device's interfaces, in the order in which they are sorted here: by port. An
 /// identifier is unique in the machine and knows no interface name: the bus address, "/", the port.
 /// Interfaces that stand for a virtual function at the same port ("pf0vf1") bear that too; what shares a port
-/// with others beyond that is told apart by the order in which the kernel made it.
+/// with others beyond that is told apart by the order of the hardware addresses, and what shares even that by
+/// the order in which the kernel made it.
 std::vector<std::string> sortAndIdentify(const std::string& address,
                                          std::vector<NetworkInterface>& interfaces);
 

@@ -152,6 +152,34 @@ TEST(NetworkSource, InterfacesOfOnePortAreToldApartByAge) {
 )");
 }
 
+TEST(NetworkSource, InterfacesOfOnePortKeepTheirIdentitiesInAnotherProbeOrder) {
+  const std::string firstAddress = "address = 02:00:5e:10:00:01;";
+  const std::string secondAddress = "address = 02:00:5e:10:00:02;";
+  for (const auto& [firstIndex, secondIndex] :
+       {std::pair("ifindex = 3", "ifindex = 10"), std::pair("ifindex = 10", "ifindex = 3")}) {
+    Machine machine(pciFunction);
+    machine.add(interfaceLines("wlan0", pciDevice, firstAddress + firstIndex) +
+                interfaceLines("ap0", pciDevice, secondAddress + secondIndex));
+    EXPECT_EQ(shown(discoverAt(machine, telling({}))), R"(40 Computer System
+  49 Network Device
+    12 wlan0 108="0000:03:00.0/1"
+    12 ap0 108="0000:03:00.0/1.2"
+)") << firstIndex;
+  }
+}
+
+TEST(NetworkSource, InterfacesOfOnePortAndAddressAreToldApartByAge) {
+  const std::string address = "address = 02:00:5e:10:00:01;";
+  Machine machine(pciFunction);
+  machine.add(interfaceLines("wlan0", pciDevice, address + "ifindex = 3") +
+              interfaceLines("ap0", pciDevice, address + "ifindex = 10"));
+  EXPECT_EQ(shown(discoverAt(machine, telling({}))), R"(40 Computer System
+  49 Network Device
+    12 wlan0 108="0000:03:00.0/1"
+    12 ap0 108="0000:03:00.0/1.2"
+)");
+}
+
 TEST(NetworkSource, PartsOfAFunctionBelongToTheFunction) {
   Machine machine(R"(
     sys/devices/platform/LNRO0005:00/subsystem -> ../../../bus/platform
