@@ -1,4 +1,5 @@
 #include <agent/framework/InventoryFields.h>
+#include <agent/framework/InventoryScalar.h>
 
 #include <algorithm>
 #include <utility>
@@ -42,6 +43,28 @@ std::optional<SourceReport::Reason> reasonNamed(std::string_view name) {
   const auto* found =
       std::find_if(reasons.begin(), reasons.end(), [&](const auto& entry) { return entry.second == name; });
   return found == reasons.end() ? std::nullopt : std::optional(found->first);
+}
+
+std::string shownPath(std::string_view path) {
+  constexpr std::size_t longest = 200;
+  constexpr std::size_t half = longest / 2;
+  if (path.size() <= longest) {
+    return std::string(path);
+  }
+  const auto isInsideCharacter = [path](std::size_t at) {
+    return (static_cast<unsigned char>(path[at]) & 0xc0U) == 0x80;
+  };
+  std::size_t headEnd = path.rfind('.', half);
+  if (headEnd == std::string_view::npos) {
+    for (headEnd = half; isInsideCharacter(headEnd); --headEnd) {
+    }
+  }
+  std::size_t tailBegin = path.find('.', path.size() - half);
+  if (tailBegin == std::string_view::npos) {
+    for (tailBegin = path.size() - half; isInsideCharacter(tailBegin); ++tailBegin) {
+    }
+  }
+  return std::string(path.substr(0, headEnd)) + "\u2026" + std::string(path.substr(tailBegin));
 }
 
 }  // namespace agent::inventory

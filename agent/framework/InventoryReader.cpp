@@ -109,7 +109,7 @@ class Handler {
   [[noreturn]] void fail(const std::string& message) const { failAt(stream_.Tell(), message); }
 
   [[noreturn]] void failAt(std::size_t offset, const std::string& message) const {
-    const std::string field = fieldPath();
+    const std::string field = inventory::shownPath(fieldPath());
     throw InventoryError(lineAt(offset) + ": " + field + (field.empty() ? "" : ": ") + message);
   }
 

@@ -36,4 +36,8 @@ inline std::string shown(const Scalar& value) {
   return '"' + cleanText(value.text.substr(0, longest)) + (isLong ? "...\"" : "\"");
 }
 
+/// The path of a field as a message shows it: the middle of a long one is cut, between two names where they
+/// are not too long themselves.
+std::string shownPath(std::string_view path);
+
 }  // namespace agent::inventory

@@ -178,6 +178,44 @@ TEST(RefusedText, IsExplainedByLineWhereItIsNoJson) {
   EXPECT_EQ(messageFor(std::string("\0", 1)), "server.json:1: not JSON: The document is empty.");
 }
 
+/// A wrong type `depth` arrays of children below the first node.
+std::string wrongTypeBelow(int depth) {
+  std::string nodes;
+  for (int i = 0; i < depth; ++i) {
+    nodes += "{\"type\": 3, \"children\": [";
+  }
+  return withNodes(nodes + "{\"type\": 0.5}");
+}
+
+TEST(RefusedText, IsExplainedInOneLineHoweverDeepTheField) {
+  const std::string expected =
+      ": expected a node type name or number, got a number that is negative, has a "
+      "fraction or is too big";
+  const std::string level = ".children[0]";
+  std::string levels;
+  for (int i = 0; i < 15; ++i) {
+    levels += level;
+  }
+  // 8 + 15 * 12 + 5 = 193 characters are few enough, 8 + 16 * 12 + 5 = 205 are not.
+  EXPECT_EQ(messageFor(wrongTypeBelow(15)), "server.json:3: nodes[0]" + levels + ".type" + expected);
+  const std::string sevenLevels = levels.substr(0, 7 * level.size());
+  const std::string cut =
+      "server.json:3: nodes[0]" + sevenLevels + "\u2026" + sevenLevels + ".type" + expected;
+  EXPECT_EQ(messageFor(wrongTypeBelow(16)), cut);
+  EXPECT_EQ(messageFor(wrongTypeBelow(60)), cut);
+}
+
+TEST(RefusedText, IsExplainedInOneLineHoweverLongTheName) {
+  std::string name = "x";
+  for (int i = 0; i < 100'000; ++i) {
+    name += "\u00e9";
+  }
+  // Names are cut between characters: 100 bytes from the front end inside one, 100 from the back do not.
+  const std::string message = messageFor("{\"" + name + "\": 1}");
+  EXPECT_EQ(message, "server.json:1: " + name.substr(0, 99) + "\u2026" + name.substr(name.size() - 100) +
+                         ": unknown member; expected one of format, version, nodes, notRead");
+}
+
 TEST(RefusedText, IsRefusedBeyondTheBounds) {
   std::string deep;
   for (std::size_t i = 0; i <= InventoryBounds::depth; ++i) {
