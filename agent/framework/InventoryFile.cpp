@@ -5,6 +5,7 @@
 #include <fcntl.h>
 #include <rapidjson/prettywriter.h>
 #include <rapidjson/stringbuffer.h>
+#include <sys/stat.h>
 #include <unistd.h>
 
 #include <algorithm>
@@ -21,8 +22,9 @@ using inventory::nameOf;
 
 class Descriptor {
  public:
+  // A pipe or a device in the place of a file must not hold up the caller: hence O_NONBLOCK.
   explicit Descriptor(const std::filesystem::path& path)
-      : number_(::open(path.c_str(), O_RDONLY | O_CLOEXEC)) {}
+      : number_(::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK)) {}
   ~Descriptor() {
     if (number_ >= 0) {
       ::close(number_);
@@ -40,11 +42,23 @@ class Descriptor {
   throw InventoryError(path.string() + ": cannot be read: " + std::generic_category().message(error));
 }
 
+/// Folders pass: reading one says best what is wrong with it.
+void checkThatItIsAFile(const Descriptor& file, const std::filesystem::path& path) {
+  struct stat status {};
+  if (::fstat(file.number(), &status) != 0) {
+    throwUnreadable(path, errno);
+  }
+  if (!S_ISREG(status.st_mode) && !S_ISDIR(status.st_mode)) {
+    throw InventoryError(path.string() + ": cannot be read: it is no regular file");
+  }
+}
+
 std::string readWhole(const std::filesystem::path& path) {
   const Descriptor file(path);
   if (file.number() < 0) {
     throwUnreadable(path, errno);
   }
+  checkThatItIsAFile(file, path);
   std::string content;
   constexpr std::size_t step = std::size_t{1} << 16U;
   for (;;) {

@@ -33,7 +33,8 @@ class InventoryError : public std::runtime_error {
 /// Reads the text of an inventory file. `fileName` is for messages alone. Throws `InventoryError`.
 NodeTree parseInventory(std::string_view json, std::string_view fileName);
 
-/// Reads an inventory file. Throws `InventoryError`, also where the file cannot be opened or read.
+/// Reads an inventory file. Throws `InventoryError`, also where the file cannot be opened or read, or is no
+/// regular file: a pipe or a device is not waited for.
 NodeTree readInventoryFile(const std::filesystem::path& path);
 
 /// The text of an inventory file. Throws `InventoryError` where the tree is beyond the bounds.

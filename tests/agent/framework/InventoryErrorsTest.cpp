@@ -6,6 +6,9 @@
 #include <ostream>
 #include <string>
 
+#include <sys/stat.h>
+#include <unistd.h>
+
 namespace agent {
 namespace {
 
@@ -234,6 +237,28 @@ TEST(RefusedText, IsRefusedBeyondTheBounds) {
 
   // Brackets without end, which a parser that calls itself would not survive.
   EXPECT_NE(messageFor(withMember("\"children\": " + std::string(1'000'000, '['))), "no error");
+}
+
+std::string messageForFile(const std::string& path) {
+  try {
+    readInventoryFile(path);
+  } catch (const InventoryError& error) {
+    return error.what();
+  }
+  return "no error";
+}
+
+TEST(RefusedFile, IsWhatCouldKeepTheReaderWaiting) {
+  const std::string pipe = ::testing::TempDir() + "swinv-pipe-" + std::to_string(::getpid());
+  ASSERT_EQ(::mkfifo(pipe.c_str(), 0600), 0);
+  EXPECT_EQ(messageForFile(pipe), pipe + ": cannot be read: it is no regular file");
+  EXPECT_EQ(::unlink(pipe.c_str()), 0);
+  EXPECT_EQ(messageForFile("/dev/zero"), "/dev/zero: cannot be read: it is no regular file");
+}
+
+TEST(RefusedFile, IsAFolderOrNone) {
+  EXPECT_EQ(messageForFile("/"), "/: cannot be read: Is a directory");
+  EXPECT_EQ(messageForFile("/no/such.json"), "/no/such.json: cannot be read: No such file or directory");
 }
 
 }  // namespace
