@@ -1,8 +1,8 @@
 #include <agent/discovery/SourceBoard.h>
 #include <agent/discovery/SourceRunner.h>
+#include <agent/framework/SignalsBlocked.h>
 
 #include <algorithm>
-#include <csignal>
 #include <exception>
 #include <system_error>
 #include <thread>
@@ -34,22 +34,6 @@ SourceBoard::Taken SourceBoard::takeBy(std::chrono::steady_clock::time_point dea
 namespace {
 
 using Clock = std::chrono::steady_clock;
-
-/// While it lives, threads that start take no signals: those are the host process's business.
-class SignalsBlocked {
- public:
-  SignalsBlocked() {
-    sigset_t all;
-    sigfillset(&all);
-    pthread_sigmask(SIG_SETMASK, &all, &before_);
-  }
-  SignalsBlocked(const SignalsBlocked&) = delete;
-  SignalsBlocked& operator=(const SignalsBlocked&) = delete;
-  ~SignalsBlocked() { pthread_sigmask(SIG_SETMASK, &before_, nullptr); }
-
- private:
-  sigset_t before_{};
-};
 
 struct Running {
   std::shared_ptr<SourceBoard> board = std::make_shared<SourceBoard>();

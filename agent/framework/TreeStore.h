@@ -4,7 +4,11 @@
 #pragma once
 
 #include <agent/framework/NodeTree.h>
+#include <agent/framework/TreeSource.h>
 
+#include <chrono>
+#include <condition_variable>
+#include <functional>
 #include <memory>
 #include <mutex>
 #include <string>
@@ -13,26 +17,65 @@ namespace agent {
 
 class TreeStore {
  public:
+  using Duration = std::chrono::steady_clock::duration;
+  /// Tells the time; called from any thread, also while the store is locked.
+  using Clock = std::function<std::chrono::steady_clock::time_point()>;
+
+  /// How long a tree, or a failure to read one, stands before a request has the source read again.
+  static constexpr Duration usualLifetime = std::chrono::seconds(60);
+
   /// The store of this process. It is never destroyed: a thread may still ask it while the process ends.
   static TreeStore& instance();
 
-  TreeStore() = default;
+  explicit TreeStore(Duration lifetime = usualLifetime, Clock clock = std::chrono::steady_clock::now);
+  /// As `waitForRereading`.
+  ~TreeStore();
   TreeStore(const TreeStore&) = delete;
   TreeStore& operator=(const TreeStore&) = delete;
 
   /// The current tree. The first call reads it from the source that the environment names; calls that come
-  /// meanwhile wait for it. Throws `Oru::InstrumentationException` with the reason where the source could not
-  /// be read: the failure is logged once and remembered, so that every later call fails the same way without
-  /// reading again, until `publish` brings a tree.
+  /// meanwhile wait for it. From then on no call waits: one that finds the tree older than its lifetime has
+  /// the source read again by a thread of the store's own, one at a time, and returns the tree that there is.
+  /// The new tree replaces it as a whole, unless it is equal. Where it cannot be read the earlier tree stays,
+  /// and a call after the same time tries again.
+  ///
+  /// Throws `Oru::InstrumentationException` with the reason where there is no tree because the source could
+  /// not be read. The failure stands as long as a tree would: calls fail the same way without reading, and
+  /// the first one after that reads again itself.
+  ///
+  /// Failures are logged once until a reading succeeds.
   std::shared_ptr<const NodeTree> current();
+
+  /// Waits for the re-reading that is under way, if one is.
+  void waitForRereading();
 
   /// Replaces the tree as a whole. Cursors that stand on the earlier one keep it.
   void publish(NodeTree tree);
 
  private:
-  std::mutex mutex_;  ///< guards both; held while the first tree is read
-  std::shared_ptr<const NodeTree> tree_;
-  std::string failure_;
+  using Tree = std::shared_ptr<const NodeTree>;
+  /// What a reading came to: a tree, or the reason why there is none.
+  struct Reading {
+    Tree tree;
+    std::string failure;
+  };
+
+  static Reading read(const TreeSource& source);
+  void readFirst();
+  void startRereading();
+  void reread(const TreeSource& source, Tree old);
+  void finishRereading(const Tree& old, Reading reading);
+  bool noteFailure();
+
+  const Duration lifetime_;
+  const Clock clock_;
+  std::mutex mutex_;  ///< guards what follows; held while the first tree is read
+  Tree tree_;
+  std::string failure_;                           ///< why there is no tree
+  std::chrono::steady_clock::time_point readAt_;  ///< when `tree_` or `failure_` came
+  bool isRereading_ = false;
+  bool isFailureLogged_ = false;
+  std::condition_variable reread_;  ///< the re-reading ended
 };
 
 }  // namespace agent

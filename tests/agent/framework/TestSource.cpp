@@ -13,9 +13,9 @@ std::mutex mutex;
 std::function<agent::NodeTree()> currentSource;
 std::vector<agent::testing::LoggedMessage> logged;
 
-void log(bool isTrace, const std::string& category, int level, const std::string& message) {
+void log(bool isTrace, const std::string& category, int level, const char* file, const std::string& message) {
   const std::lock_guard lock(mutex);
-  logged.push_back({isTrace, category, level, message});
+  logged.push_back({isTrace, category, level, file, message});
 }
 
 }  // namespace
@@ -52,14 +52,14 @@ std::vector<LoggedMessage> takeLog() {
 
 namespace ZelLog {
 
-void ZelLogger::logLevelMessage(const char*, const char*, unsigned int, const std::string& category,
+void ZelLogger::logLevelMessage(const char*, const char* file, unsigned int, const std::string& category,
                                 int level, const char*, int, int, const std::string& message) {
-  log(false, category, level, message);
+  log(false, category, level, file, message);
 }
 
-void ZelLogger::traceLevelMessage(const char*, const char*, unsigned int, const std::string& category,
+void ZelLogger::traceLevelMessage(const char*, const char* file, unsigned int, const std::string& category,
                                   int level, const char*, int, int, const std::string& message) {
-  log(true, category, level, message);
+  log(true, category, level, file, message);
 }
 
 }  // namespace ZelLog

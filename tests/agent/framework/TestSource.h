@@ -17,6 +17,7 @@ struct LoggedMessage {
   bool isTrace = false;
   std::string category;
   int level = 0;
+  std::string file;
   std::string message;
 };
 

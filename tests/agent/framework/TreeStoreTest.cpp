@@ -105,6 +105,7 @@ TEST_F(TreeStoreTest, FailureIsLoggedOnceAndRemembered) {
   for (const testing::LoggedMessage& message : log) {
     EXPECT_EQ(message.category, "Oru.Framework");
     EXPECT_EQ(message.level, 3000);
+    EXPECT_EQ(message.file, "agent/framework/TreeStore.cpp");
     EXPECT_THAT(message.message, HasSubstr("server.json:17"));
   }
 }
