@@ -1,4 +1,5 @@
 #include <bench/Measurements.h>
+#include <malloc.h>
 #include <unistd.h>
 
 #include <fstream>
@@ -68,6 +69,17 @@ std::size_t Peer::get(const std::string& instanceId) {
                                          std::nullopt, [](const cimom::Instance&) { return true; }));
 }
 
+void Peer::askForNothing() {
+  // No node has the number 0.
+  const cimom::Outcome outcome =
+      manager_->getInstance(std::string(className) + ".InstanceID=\"1@0\"", std::nullopt,
+                            [](const cimom::Instance&) { return true; });
+  if (outcome.status.code != CMPI_RC_ERR_NOT_FOUND) {
+    throw std::runtime_error("asking for a node that there is not gave status " +
+                             std::to_string(outcome.status.code) + " " + outcome.status.description);
+  }
+}
+
 std::vector<std::string> Peer::describeInstances() {
   std::vector<std::string> texts;
   delivered(
@@ -94,6 +106,8 @@ std::vector<std::string> Peer::instanceIds() {
 }
 
 std::size_t residentBytes() {
+  // Room that was used once and is free again would hide what is taken next.
+  malloc_trim(0);
   std::size_t total = 0;
   std::size_t resident = 0;
   std::ifstream("/proc/self/statm") >> total >> resident;

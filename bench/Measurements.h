@@ -22,6 +22,9 @@ class Peer {
   std::size_t names();
   std::size_t get(const std::string& instanceId);
 
+  /// Asks for an instance that no machine has.
+  void askForNothing();
+
   /// Every instance as a text, to hold two peers against each other.
   std::vector<std::string> describeInstances();
   /// InstanceIDs in the order of delivery.
@@ -31,7 +34,7 @@ class Peer {
   std::unique_ptr<cimom::ObjectManager> manager_;
 };
 
-/// Resident memory of this process, in bytes (/proc/self/statm).
+/// Resident memory of this process without what its allocator keeps free, in bytes (/proc/self/statm).
 std::size_t residentBytes();
 
 }  // namespace bench

@@ -25,6 +25,8 @@ struct Property {
   const char* name;
   Getter getter;
 };
+template <typename Getter>
+Property(const char*, Getter) -> Property<Getter>;
 
 /// What an instance carries, in the order in which it is set. Properties whose getters have nothing today
 /// stay in the sequence: a getter that learns its value publishes it. A tuple, so that each getter is known
@@ -181,6 +183,7 @@ CMPIObjectPath* CMPISoftwareIdentity::getObjectPath() {
   return path;
 }
 
+// The getters are put in the place of their calls, here and in the walk below: most do less than a call does.
 [[gnu::flatten]] CMPIInstance* CMPISoftwareIdentity::getCMPIInstance(const char** properties) {
   const TraceScope scope(loggerCMPISoftwareIdentity, " properties=", static_cast<const void*>(properties));
   CMPIObjectPath* path = getObjectPath();
@@ -197,12 +200,12 @@ CMPIObjectPath* CMPISoftwareIdentity::getObjectPath() {
   return instance;
 }
 
-CMPISoftwareIdentity::operator bool() {
+[[gnu::flatten]] CMPISoftwareIdentity::operator bool() {
   const TraceScope scope(loggerCMPISoftwareIdentity);
   return static_cast<bool>(softwareIdentity);
 }
 
-void CMPISoftwareIdentity::operator++() {
+[[gnu::flatten]] void CMPISoftwareIdentity::operator++() {
   const TraceScope scope(loggerCMPISoftwareIdentity);
   ++softwareIdentity;
 }

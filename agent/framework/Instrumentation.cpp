@@ -77,7 +77,7 @@ Index nodeAt(const NodeTree& tree, const std::string& path) {
 /// digits: these are copied as one piece of 16 bytes, with their end, in place of a call. One piece also lets
 /// the reader of the copy have its bytes before they reach the memory, which processors do for what was
 /// stored at once.
-std::string copyOf(std::string_view path) {
+[[gnu::always_inline]] inline std::string copyOf(std::string_view path) {
   constexpr std::string_view usual = "...............";
   if (path.size() != usual.size()) {
     return std::string(path);

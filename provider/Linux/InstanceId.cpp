@@ -9,18 +9,14 @@
 
 namespace Oru::SoftwareInventoryProfileProvider {
 
-void InstanceIdMaker::beginWith(const std::string& parentText) {
-  const auto digits = numberOfHexadecimalDigits(parentText);
-  const DecimalText number(digits ? *digits : StreamExtraction(parentText).hexadecimal());
-  prefixLength_ = number.view().copy(prefix_.data(), prefix_.size() - 1);
-  prefix_[prefixLength_++] = '@';
-  parentText_ = parentText;
-}
-
 void InstanceIdMaker::make(const std::string& parentText, const std::string& nodeText,
                            std::string& instanceId) {
-  if (parentText != parentText_) {
-    beginWith(parentText);
+  const auto digits = numberOfHexadecimalDigits(parentText);
+  const std::uint64_t parent = digits ? *digits : StreamExtraction(parentText).hexadecimal();
+  if (parent != parent_) {
+    parent_ = parent;
+    prefixLength_ = DecimalText(parent).view().copy(prefix_.data(), prefix_.size() - 1);
+    prefix_[prefixLength_++] = '@';
   }
   // Nearly all node texts are of this length, and so are nearly all InstanceIDs of what went before: pieces
   // of known lengths, the node's with its NUL, are put in place without a call.

@@ -12,8 +12,8 @@
 
 namespace Oru::SoftwareInventoryProfileProvider {
 
-/// Makes InstanceIDs of nodes one after the other. The number of a parent is worked out once for children in
-/// a row.
+/// Makes InstanceIDs of nodes one after the other. The number of a parent is written once for children in a
+/// row.
 class InstanceIdMaker {
  public:
   /// Fills `instanceId`, in the room that it has, from the path texts of a node's parent and of itself. A
@@ -21,10 +21,8 @@ class InstanceIdMaker {
   void make(const std::string& parentText, const std::string& nodeText, std::string& instanceId);
 
  private:
-  void beginWith(const std::string& parentText);
-
-  std::string parentText_;
-  std::array<char, 24> prefix_{'0', '@'};  ///< what an InstanceID below parentText_ begins with
+  std::uint64_t parent_ = 0;
+  std::array<char, 24> prefix_{'0', '@'};  ///< what an InstanceID below parent_ begins with
   std::size_t prefixLength_ = 2;
 };
 

@@ -75,9 +75,34 @@ class FieldWriter {
   char* end_ = text_;
 };
 
+constexpr bool isDigit(char character) {
+  return character >= '0' && character <= '9';
+}
+
+/// Is this a date as nearly all are, "12/31/2010"?
+bool isPlain(std::string_view text) {
+  constexpr std::string_view pattern = "00/00/0000";
+  return text.size() == pattern.size() && text[2] == '/' && text[5] == '/' && isDigit(text[0]) &&
+         isDigit(text[1]) && isDigit(text[3]) && isDigit(text[4]) && isDigit(text[6]) && isDigit(text[7]) &&
+         isDigit(text[8]) && isDigit(text[9]);
+}
+
+constexpr unsigned int twoDigits(const char* at) {
+  return static_cast<unsigned int>(at[0] - '0') * 10 + static_cast<unsigned int>(at[1] - '0');
+}
+
+constexpr void putTwoDigits(char* at, unsigned int number) {
+  at[0] = static_cast<char>('0' + number / 10);
+  at[1] = static_cast<char>('0' + number % 10);
+}
+
 }  // namespace
 
 MonthDayYear scanDate(std::string_view text) {
+  if (isPlain(text)) {
+    return {twoDigits(text.data()), twoDigits(text.data() + 3),
+            twoDigits(text.data() + 6) * 100 + twoDigits(text.data() + 8)};
+  }
   // A C string ends at its first NUL.
   std::string_view rest = text.substr(0, text.find('\0'));
   MonthDayYear date;
@@ -89,6 +114,19 @@ MonthDayYear scanDate(std::string_view text) {
 std::size_t formatDate(MonthDayYear date, long secondsWest, DateBuffer& buffer) {
   const bool east = secondsWest < 0;
   const long minutes = east ? -(secondsWest / 60) : secondsWest / 60;
+  // Where every field fills its width, as nearly always, digits go straight into their places.
+  if (date.year >= 1000 && date.year <= 9999 && date.month <= 99 && date.day <= 99 && minutes <= 999) {
+    constexpr std::string_view pattern = "yyyymmdd000000.000000+mmm";
+    std::memcpy(buffer.data(), pattern.data(), pattern.size() + 1);
+    putTwoDigits(&buffer[0], date.year / 100);
+    putTwoDigits(&buffer[2], date.year % 100);
+    putTwoDigits(&buffer[4], date.month);
+    putTwoDigits(&buffer[6], date.day);
+    buffer[21] = east ? '-' : '+';
+    buffer[22] = static_cast<char>('0' + minutes / 100);
+    putTwoDigits(&buffer[23], static_cast<unsigned int>(minutes % 100));
+    return pattern.size();
+  }
   FieldWriter text;
   text.append(date.year, 4, ' ');
   text.append(date.month, 2, '0');

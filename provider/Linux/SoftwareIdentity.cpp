@@ -4,6 +4,7 @@
 #include <Trace.h>
 
 #include <ctime>
+#include <utility>
 
 namespace Oru::SoftwareInventoryProfileProvider {
 
@@ -174,8 +175,7 @@ bool SoftwareIdentity::getVersionString(std::string& versionString) {
   const TraceScope scope(loggerSoftwareIdentity);
   NodeLexicon::Properties property = NodeLexicon::VersionStringProperty;
   if (currentType() == NodeLexicon::FirmwareNode) {
-    const std::string description = instrumentation.getNodeDescription();
-    if (contains(description, "FPGA Firmware") || contains(description, "Baseboard")) {
+    if (firmwareKind().hasFirmwareRevision) {
       property = NodeLexicon::FirmwareRevisionProperty;
     }
   } else if (currentType() == NodeLexicon::DriverNode) {
@@ -186,7 +186,8 @@ bool SoftwareIdentity::getVersionString(std::string& versionString) {
 
 bool SoftwareIdentity::getDescription(std::string& description) {
   const TraceScope scope(loggerSoftwareIdentity);
-  description = instrumentation.getNodeDescription();
+  // Copied into the room that is there: taking over the text's own would give up room that later texts need.
+  description.assign(static_cast<const std::string&>(instrumentation.getNodeDescription()));
   std::string name;
   if (instrumentation.getProperty(NodeLexicon::NameProperty, name) && contains(name, "Velmor2")) {
     description = "Orsella Controller II Firmware";
@@ -209,21 +210,31 @@ bool SoftwareIdentity::getInstallDate(std::string& installDate) {
   return getReleaseDate(installDate);
 }
 
+/// An instance asks three times about its description, and many have the same: it is searched once for a row.
 /// The order of the tests decides for descriptions that name more than one kind.
+const SoftwareIdentity::FirmwareKind& SoftwareIdentity::firmwareKind() {
+  std::string description = instrumentation.getNodeDescription();
+  if (description == lastFirmwareKind.description) {
+    return lastFirmwareKind;
+  }
+  FirmwareKind kind;
+  kind.hasFirmwareRevision = contains(description, "FPGA Firmware") || contains(description, "Baseboard");
+  if (contains(description, "BIOS") || contains(description, "UEFI")) {
+    kind.classification = {11, "BIOS/FCode"};
+  } else if (contains(description, "Diagnostic")) {
+    kind.classification = {7, "Diagnostic Software"};
+  }
+  kind.description = std::move(description);
+  lastFirmwareKind = std::move(kind);
+  return lastFirmwareKind;
+}
+
 SoftwareIdentity::Classification SoftwareIdentity::classify() {
   switch (currentType()) {
     case NodeLexicon::BiosNode:
       return {11, "BIOS/FCode"};
-    case NodeLexicon::FirmwareNode: {
-      const std::string description = instrumentation.getNodeDescription();
-      if (contains(description, "BIOS") || contains(description, "UEFI")) {
-        return {11, "BIOS/FCode"};
-      }
-      if (contains(description, "Diagnostic")) {
-        return {7, "Diagnostic Software"};
-      }
-      return {10, "Firmware"};
-    }
+    case NodeLexicon::FirmwareNode:
+      return firmwareKind().classification;
     case NodeLexicon::ApplicationSoftwareNode:
       return {4, "Application Software"};
     case NodeLexicon::DriverNode:

@@ -113,9 +113,16 @@ class SoftwareIdentity {
     unsigned short value;
     const char* description;
   };
+  /// What a firmware's description says of it.
+  struct FirmwareKind {
+    std::string description;
+    bool hasFirmwareRevision = false;  ///< its version is its firmware revision
+    Classification classification{10, "Firmware"};
+  };
 
   bool selectCurrentNodeType();
   [[nodiscard]] int currentType() const;
+  const FirmwareKind& firmwareKind();
   Classification classify();
   bool getVersionNumber(NodeLexicon::Properties property, unsigned short& number);
 
@@ -128,6 +135,7 @@ class SoftwareIdentity {
   std::vector<NodeLexicon::NodeType>::iterator currentNodeType;
   DateFormatter dateBuffer;  ///< holds the last formatted date
   InstanceIdMaker instanceIds;
+  FirmwareKind lastFirmwareKind;  ///< of the description that was asked about last
 };
 
 }  // namespace Oru::SoftwareInventoryProfileProvider

@@ -201,13 +201,12 @@ void emit(const LogPoint& point, int level, Text text) {
   }
 }
 
-// The point comes by value: a scope whose own copy is seen by nobody takes no memory while nothing is traced.
-[[gnu::noinline, gnu::cold]] inline void emitEvent(LogPoint point, int level, MessageType type) {
+[[gnu::noinline]] inline void emitEvent(const LogPoint& point, int level, MessageType type) {
   emit(point, level, [&] { return trace(point.site.function, point.site.file, point.site.line, type); });
 }
 
-[[gnu::noinline, gnu::cold]] inline void emitEvent(LogPoint point, int level, MessageType type,
-                                                   const std::string& parameters) {
+[[gnu::noinline]] inline void emitEvent(const LogPoint& point, int level, MessageType type,
+                                        const std::string& parameters) {
   emit(point, level, [&] {
     return tracepara(point.site.function, point.site.file, point.site.line, parameters.c_str(), type);
   });
@@ -277,13 +276,13 @@ class TraceScope {
   explicit TraceScope(const LogPoint& point, const Parameters&... parameters) : point_(point) {
     if (trace_detail::mayBeOn(routineLevel)) [[unlikely]] {
       exceptionsAtEntry_ = std::uncaught_exceptions();
-      enter(point, parameters...);
+      enter(point.logger, point.site.function, point.site.file, point.site.line, parameters...);
     }
   }
 
   ~TraceScope() {
     if (exceptionsAtEntry_ != notTraced) [[unlikely]] {
-      leave(point_, exceptionsAtEntry_);
+      leave(point_.logger, point_.site.function, point_.site.file, point_.site.line, exceptionsAtEntry_);
     }
   }
 
@@ -293,16 +292,25 @@ class TraceScope {
  private:
   static constexpr int notTraced = -1;
 
-  static void enter(LogPoint point) { trace_detail::emitEvent(point, routineLevel, ENTERING); }
+  // These take the point in pieces: a scope of which nobody sees more than its parts is never put together in
+  // memory, so that one without a trace costs its look at the gate and no more.
 
   template <typename... Parameters>
-  [[gnu::noinline, gnu::cold]] static void enter(LogPoint point, const Parameters&... parameters) {
-    trace_detail::emitEvent(point, routineLevel, ENTERING, trace_detail::parameterList(parameters...));
+  [[gnu::noinline, gnu::cold]] static void enter(const std::string& logger, const char* function,
+                                                 const char* file, unsigned int line,
+                                                 const Parameters&... parameters) {
+    const LogPoint point(logger, {function, file, line});
+    if constexpr (sizeof...(parameters) == 0) {
+      trace_detail::emitEvent(point, routineLevel, ENTERING);
+    } else {
+      trace_detail::emitEvent(point, routineLevel, ENTERING, trace_detail::parameterList(parameters...));
+    }
   }
 
-  [[gnu::noinline, gnu::cold]] static void leave(LogPoint point, int exceptionsAtEntry) {
+  [[gnu::noinline, gnu::cold]] static void leave(const std::string& logger, const char* function,
+                                                 const char* file, unsigned int line, int exceptionsAtEntry) {
     if (std::uncaught_exceptions() <= exceptionsAtEntry) {
-      trace_detail::emitEvent(point, routineLevel, EXITING);
+      trace_detail::emitEvent({logger, {function, file, line}}, routineLevel, EXITING);
     }
   }
 

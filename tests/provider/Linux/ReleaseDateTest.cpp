@@ -80,6 +80,27 @@ TEST(ReleaseDate, ScansTheCornersAsScanfDoes) {
   compareScan(std::string("1/2\0/3", 6));
 }
 
+TEST(ReleaseDate, ScansPlainDatesAndWhatIsOneCharacterOffAsScanfDoes) {
+  const std::string digits = "0123456789";
+  const std::string others = "0/9:+- \tx";
+  std::mt19937 random(20260103);  // NOLINT(cert-msc32-c,cert-msc51-cpp): the same texts in every run
+  for (int round = 0; round < 2000; ++round) {
+    std::string plain = "00/00/0000";
+    for (char& character : plain) {
+      character = character == '/' ? '/' : digits[random() % digits.size()];
+    }
+    compareScan(plain);
+    for (std::size_t at = 0; at < plain.size(); ++at) {
+      std::string text = plain;
+      text[at] = others[random() % others.size()];
+      compareScan(text);
+    }
+    compareScan(plain + "0");
+    compareScan(plain.substr(1));
+    ASSERT_FALSE(testing::Test::HasFailure());
+  }
+}
+
 TEST(ReleaseDate, ScansRandomTextsAsScanfDoes) {
   std::mt19937 random(20260102);  // NOLINT(cert-msc32-c,cert-msc51-cpp): the same texts in every run
   const std::string alphabet = "0123456789////+- \tx";
