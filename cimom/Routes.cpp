@@ -12,7 +12,7 @@ Routes::Routes(const ClassRepository& schema, const Broker& broker,
   for (const ProviderRegistration& each : registrations) {
     const ClassInfo* info = classes_.find(each.className);
     if (info == nullptr)
-      throw std::runtime_error(each.where + ": registered class " + each.className + " is not in the schema");
+      throw RegistrationError(each.where + ": registered class " + each.className + " is not in the schema");
     ProviderLibrary& serving = library(each, broker, providerFolder, log);
     for (const std::string& nameSpace : each.nameSpaces) {
       auto found = std::find_if(nameSpaces_.begin(), nameSpaces_.end(),
@@ -20,8 +20,8 @@ Routes::Routes(const ClassRepository& schema, const Broker& broker,
       if (found == nameSpaces_.end())
         found = nameSpaces_.emplace(nameSpaces_.end(), nameSpace, ByClass());
       if (!found->second.emplace(info, Route{info, each.instance, each.association, &serving}).second)
-        throw std::runtime_error(each.where + ": class " + each.className + " is registered twice in " +
-                                 nameSpace);
+        throw RegistrationError(each.where + ": class " + each.className + " is registered twice in " +
+                                nameSpace);
     }
   }
 }

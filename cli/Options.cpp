@@ -180,14 +180,28 @@ CommandLine usageError(std::string_view what, std::optional<Command> command) {
   return {std::nullopt, 2, {}, std::string(what) + "\nTry '" + help + "'."};
 }
 
+/// Behind this argument nothing is an option.
+constexpr std::string_view optionsEnd = "--";
+
+/// Whether an argument that was not expected looks like an option, but stands where there are none. What is
+/// an option, and was not expected, can stand nowhere else.
+bool standsBehindOptions(const std::vector<std::string>& arguments, const std::string& argument) {
+  const auto end = std::find(arguments.begin(), arguments.end(), optionsEnd);
+  const std::vector<std::string> options = optionNames();
+  const bool isOption =
+      std::find(options.begin(), options.end(), argument.substr(0, argument.find('='))) != options.end();
+  return end != arguments.end() && (isOption || std::find(arguments.begin(), end, argument) == end);
+}
+
 /// What was typed in the place of a command, or beyond the arguments of one.
-std::string unexpected(const CLI::App& app) {
-  const std::vector<std::string> extras = app.remaining(true);
+std::string unexpected(const CLI::App& app, const std::vector<std::string>& arguments) {
+  std::vector<std::string> extras = app.remaining(true);
+  std::erase(extras, optionsEnd);
   if (extras.empty()) {
     return "an argument was not expected";
   }
   const std::string& first = extras.front();
-  if (first.size() > 1 && first.front() == '-') {
+  if (first.size() > 1 && first.front() == '-' && !standsBehindOptions(arguments, first)) {
     const auto nearest = nearestName(first.substr(0, first.find('=')), optionNames());
     return "there is no option " + first + (nearest ? "; did you mean " + *nearest + "?" : "");
   }
@@ -204,19 +218,21 @@ std::string unexpected(const CLI::App& app) {
 
 }  // namespace
 
-CommandLine parseCommandLine(std::vector<std::string> arguments) {
+CommandLine parseCommandLine(const std::vector<std::string>& arguments) {
   Raw raw;
   const std::unique_ptr<CLI::App> app = makeParser(raw);
-  std::reverse(arguments.begin(), arguments.end());  // the parser takes them off the back
   try {
-    app->parse(std::move(arguments));
+    app->parse(std::vector<std::string>(arguments.rbegin(), arguments.rend()));  // it takes them off the back
     return {interpret(*app, std::move(raw)), 0, {}, {}};
   } catch (const CLI::CallForHelp&) {
     return {std::nullopt, 0, std::string(helpText(commandOf(*app))), {}};
   } catch (const CLI::CallForVersion&) {
+    if (app->remaining_size(true) != 0) {
+      return usageError(unexpected(*app, arguments), commandOf(*app));
+    }
     return {std::nullopt, 0, "swinv " SWINV_VERSION "\n", {}};
   } catch (const CLI::ExtrasError&) {
-    return usageError(unexpected(*app), commandOf(*app));
+    return usageError(unexpected(*app, arguments), commandOf(*app));
   } catch (const CLI::ParseError& error) {
     return usageError(error.what(), commandOf(*app));
   } catch (const UsageError& error) {

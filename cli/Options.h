@@ -36,7 +36,7 @@ struct CommandLine {
 };
 
 /// Parses the arguments behind the program's name. Touches nothing but its arguments.
-CommandLine parseCommandLine(std::vector<std::string> arguments);
+CommandLine parseCommandLine(const std::vector<std::string>& arguments);
 
 /// Every option with its leading dashes, as `swinv` takes them.
 std::vector<std::string> optionNames();

@@ -64,6 +64,11 @@ cimom::Configuration configure(const Options& options) {
       configuration.providers.push_back(std::move(registration));
     }
   }
+  if (configuration.providers.empty()) {
+    throw CommandError("no provider is registered: no .reg file in the schema folder " +
+                       layout.schema.string() +
+                       " names a class\nThe files belong to swinv; install or build swinv again.");
+  }
   if (options.logLevel.value_or(LogLevel::Off) != LogLevel::Off) {
     configuration.log = [](std::string_view line) { complain(line); };
   }
@@ -97,6 +102,8 @@ Session::Session(const Options& options)
     manager_ = std::make_unique<cimom::ObjectManager>(configure(options));
   } catch (const CommandError&) {
     throw;
+  } catch (const cimom::RegistrationError& error) {
+    throw CommandError(std::string("the registration of the providers cannot be used: ") + error.what());
   } catch (const std::exception& error) {
     throw CommandError(std::string("the CIM schema cannot be used: ") + error.what());
   }

@@ -6,6 +6,8 @@
 
 #include <array>
 #include <filesystem>
+#include <fstream>
+#include <utility>
 
 #include <fcntl.h>
 #include <unistd.h>
@@ -124,6 +126,48 @@ TEST(Failure, AMissingSchemaIsNamed) {
   const MovedProgram moved;
   expectFailure(run({{"list"}, {}, moved.program()}), 1,
                 AllOf(HasSubstr("share/swinv/schema"), HasSubstr("install")));
+}
+
+/// An installation whose schema folder can be changed.
+class MovedSchema : public MovedProgram {
+ public:
+  MovedSchema() {
+    link("lib");
+    fs::create_directories(folder());
+    for (const auto& file : fs::directory_iterator(original() / "share" / "swinv" / "schema")) {
+      fs::copy_file(file.path(), folder() / file.path().filename());
+    }
+  }
+  [[nodiscard]] fs::path folder() const {
+    return program().parent_path().parent_path() / "share" / "swinv" / "schema";
+  }
+  [[nodiscard]] fs::path registration() const { return folder() / "SoftwareInventoryProvider.reg"; }
+  [[nodiscard]] Result list() const { return run({{"list", "--inventory", small}, {}, program()}); }
+};
+
+TEST(Failure, ASchemaWithoutRegistrationsIsNamed) {
+  const MovedSchema moved;
+  EXPECT_EQ(moved.list().standardOutput, swinv({"list", "--inventory", small}).standardOutput);
+  const auto message =
+      AllOf(HasSubstr("no provider is registered"), HasSubstr(moved.folder().string()), HasSubstr("install"));
+  std::ofstream(moved.registration(), std::ios::trunc).close();
+  expectFailure(moved.list(), 1, message);
+  fs::remove(moved.registration());
+  expectFailure(moved.list(), 1, message);
+}
+
+TEST(Failure, ABadRegistrationIsNamedAsOne) {
+  const MovedSchema moved;
+  const std::string file = moved.registration().string();
+  for (const auto& [line, complaint] :
+       {std::pair("nonsense", ":1: expected [CLASS]"), std::pair("[A Class]", ":1: expected the name"),
+        std::pair("[X_Y]\nprovider: p\nlocation: l\ntype: instance\nnamespace: root/cimv2\n",
+                  ":1: registered class X_Y is not in the schema")}) {
+    std::ofstream(moved.registration(), std::ios::trunc) << line << '\n';
+    expectFailure(moved.list(), 1,
+                  AllOf(HasSubstr("registration"), HasSubstr(file + complaint),
+                        testing::Not(HasSubstr("schema cannot be used"))));
+  }
 }
 
 TEST(Failure, AMissingProviderIsNamed) {

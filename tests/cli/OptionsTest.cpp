@@ -100,6 +100,20 @@ TEST(Options, WhatMakesNoSenseIsAUsageError) {
   expectUsageError({"list", "--property", "Name,,X"}, "empty name");
 }
 
+TEST(Options, BehindTwoDashesNothingIsAnOption) {
+  EXPECT_EQ(parsed({"get", "--inventory", "F", "--", "-1"}).object, "-1");
+  expectUsageError({"get", "--", "-1", "--inventory", "F"}, "'--inventory' is one argument too many");
+  expectUsageError({"get", "--inventory", "F", "--", "-1", "--inventory=G"},
+                   "'--inventory=G' is one argument too many");
+  expectUsageError({"get", "--", "-1", "--nothing"}, "'--nothing' is one argument too many");
+  expectUsageError({"get", "--inventry", "F", "--", "-1"}, "did you mean --inventory?");
+}
+
+TEST(Options, TheVersionTakesNothing) {
+  expectUsageError({"--version", "extra"}, "there is no command 'extra'");
+  expectUsageError({"--version", "--extra"}, "there is no option --extra");
+}
+
 TEST(Options, AnOptionThatACommandDoesNotTakeIsAUsageError) {
   expectUsageError({"names", "--property", "X"}, "'swinv names' takes no --property");
   expectUsageError({"tree", "--provider", "x.so"}, "'swinv tree' takes no --provider");
