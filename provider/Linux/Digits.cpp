@@ -68,8 +68,15 @@ constexpr std::uint64_t decimalDigits(std::uint64_t number) {
 }  // namespace
 
 std::optional<std::uint64_t> numberOfHexadecimalDigits(std::string_view text) {
-  if (text.size() < 8 || text.size() > 16) {
+  if (text.empty() || text.size() > 16) {
     return std::nullopt;
+  }
+  if (text.size() < 8) {
+    std::uint64_t word = inEachByte('0');
+    for (const char character : text) {
+      word = (word >> 8U) | (std::uint64_t{static_cast<unsigned char>(character)} << 56U);
+    }
+    return areHexadecimal(word) ? std::optional(hexadecimalNumber(word)) : std::nullopt;
   }
   // Where the first eight and the last eight digits overlap, they are the same.
   const std::uint64_t first = load(text.data());

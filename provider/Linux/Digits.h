@@ -9,7 +9,7 @@
 
 namespace Oru::SoftwareInventoryProfileProvider {
 
-/// The number that 8 to 16 hexadecimal digits of either case stand for; nothing for any other text.
+/// The number that 1 to 16 hexadecimal digits of either case stand for; nothing for any other text.
 std::optional<std::uint64_t> numberOfHexadecimalDigits(std::string_view text);
 
 /// The decimal digits of a number, without leading zeros.
