@@ -92,8 +92,8 @@ void TreeStore::startRereading() {
   isRereading_ = true;
   try {
     const SignalsBlocked blocked;
-    std::thread([this, source = TreeSource::fromEnvironment(), old = tree_]() mutable {
-      reread(source, std::move(old));
+    std::thread([this, source = TreeSource::fromEnvironment(), old = tree_] {
+      reread(source, old);
     }).detach();
   } catch (const std::exception& error) {
     isRereading_ = false;
@@ -106,7 +106,7 @@ void TreeStore::startRereading() {
   }
 }
 
-void TreeStore::reread(const TreeSource& source, Tree old) {
+void TreeStore::reread(const TreeSource& source, const Tree& old) {
   Reading reading = read(source);
   if (reading.tree && *reading.tree == *old) {
     reading.tree = old;

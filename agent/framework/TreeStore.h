@@ -63,7 +63,7 @@ class TreeStore {
   static Reading read(const TreeSource& source);
   void readFirst();
   void startRereading();
-  void reread(const TreeSource& source, Tree old);
+  void reread(const TreeSource& source, const Tree& old);
   void finishRereading(const Tree& old, Reading reading);
   bool noteFailure();
 
