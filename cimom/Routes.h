@@ -30,7 +30,7 @@ struct Route {
 /// Immutable once made, so that any number of threads may read it.
 class Routes {
  public:
-  /// Throws `std::runtime_error` for a registration of a class that the schema lacks, and for two of one
+  /// Throws `RegistrationError` for a registration of a class that the schema lacks, and for two of one
   /// class in one namespace. No library is loaded yet.
   Routes(const ClassRepository& schema, const Broker& broker,
          const std::vector<ProviderRegistration>& registrations, const std::filesystem::path& providerFolder,
