@@ -2,16 +2,12 @@
 //
 // Every event is formatted by a helper into that helper's static buffer, and goes first to the log and then
 // to the trace channel, formatted afresh for each. Where the logger can tell that a level is off for a
-// channel, nothing is formatted for it. Call sites say an event once:
+// channel, nothing is formatted for it. A call site says an event once; function, file and line come by
+// themselves, the file relative to provider/ by the compiler's prefix map.
 //
-//   TraceScope scope(loggerSoftwareIdentity, " filterType=", type);    entry now, exit when the function
-//   returns traceMethod(loggerSoftwareInventoryProvider);                      a function that does little
-//   was invoked traceMessage(loggerSoftwareIdentity, "Complete Path has been passed");
-//   traceVariable(loggerCMPISoftwareIdentity, "instanceID", value);
-//   traceException(loggerSoftwareInventoryProvider, exception);        the one event at the error level
-//
-// Function, file and line of the call come by themselves. Files are named relative to provider/, by the
-// compiler's prefix map.
+// `TraceScope` says entry and exit, with parameters where there are any; `traceMethod` that a function which
+// does little was invoked; `traceMessage`, `traceVariable` and `traceException` say what they are named
+// after, the last at the error level.
 //
 // Threads: each thread formats into buffers of its own.
 #pragma once
@@ -261,6 +257,10 @@ inline void traceVariable(const LogPoint& point, const char* name, const std::st
   trace_detail::emit(point, routineLevel,
                      [&] { return trace(name, point.site.file, point.site.line, value); });
 }
+inline void traceVariable(const LogPoint& point, const char* name, const char* value) {
+  trace_detail::emit(point, routineLevel,
+                     [&] { return trace(name, point.site.file, point.site.line, value); });
+}
 inline void traceVariable(const LogPoint& point, const char* name, int value) {
   trace_detail::emit(point, routineLevel,
                      [&] { return traceInteger(name, point.site.file, point.site.line, value); });
@@ -316,43 +316,6 @@ class TraceScope {
 
   LogPoint point_;
   int exceptionsAtEntry_ = notTraced;
-};
-
-/// The same with the parameters in both events, and at another level where one is given.
-class ParameterScope {
- public:
-  /// A level for the scope's events.
-  struct Level {
-    int value;
-  };
-
-  template <typename... Parameters>
-  explicit ParameterScope(const LogPoint& point, const Parameters&... parameters)
-      : ParameterScope(point, Level{routineLevel}, parameters...) {}
-
-  template <typename... Parameters>
-  ParameterScope(const LogPoint& point, Level level, const Parameters&... parameters)
-      : point_(point), level_(level.value), exceptionsAtEntry_(std::uncaught_exceptions()) {
-    if (trace_detail::mayBeOn(level_)) {
-      parameters_ = trace_detail::parameterList(parameters...);
-      trace_detail::emitEvent(point_, level_, ENTERING, parameters_);
-    }
-  }
-
-  ~ParameterScope() {
-    if (trace_detail::mayBeOn(level_) && std::uncaught_exceptions() <= exceptionsAtEntry_) {
-      trace_detail::emitEvent(point_, level_, EXITING, parameters_);
-    }
-  }
-
-  ParameterScope(const ParameterScope&) = delete;
-  ParameterScope& operator=(const ParameterScope&) = delete;
-
- private:
-  LogPoint point_;
-  int level_;
-  int exceptionsAtEntry_;
-  std::string parameters_;
 };
 
 /// The banner at the start of every function of the provider interface that does real work: the separator

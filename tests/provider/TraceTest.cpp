@@ -4,6 +4,8 @@
 
 #include <thread>
 
+#include "standin/StandIn.h"
+
 namespace {
 
 using namespace Oru::SoftwareInventoryProfileProvider;  // NOLINT(google-build-using-namespace)
@@ -51,6 +53,16 @@ TEST(Trace, NullTextsPrintAsTheCLibraryPrintsThem) {
   EXPECT_THAT(trace(null, null, 7, ENTERING), StrEq("ENTERING: (null)() in (null) [Line: 7]"));
   EXPECT_THAT(tracepara("f", "a.cpp", 7, null, METHOD),
               StrEq("METHOD: f() was invoked in a.cpp [Line: 7],Parameters List: (null)"));
+}
+
+TEST(Trace, AVariableEventTakesANullText) {
+  standin::world().forget();
+  const std::string logger(traceCategory);
+  traceVariable(logger, "resultClass", static_cast<const char*>(nullptr));
+  ASSERT_EQ(standin::world().log.size(), 2U);
+  EXPECT_THAT(standin::world().log[0].text,
+              testing::StartsWith("VARIABLE: 'resultClass' has Value '(null)' at line "));
+  EXPECT_EQ(standin::world().log[1].text, standin::world().log[0].text);
 }
 
 TEST(Trace, LongTextsAreCutAt511) {
