@@ -11,8 +11,8 @@ using agent::NodeTreeBuilder;
 
 std::string busAddress(std::size_t number) {
   char text[32];
-  std::snprintf(text, sizeof(text), "%04zx:%02zx:%02zx.%zx", number >> 16U, (number >> 8U) & 0xffU,
-                (number >> 3U) & 31U, number & 7U);
+  static_cast<void>(std::snprintf(text, sizeof(text), "%04zx:%02zx:%02zx.%zx", number >> 16U,
+                                  (number >> 8U) & 0xffU, (number >> 3U) & 31U, number & 7U));
   return text;
 }
 

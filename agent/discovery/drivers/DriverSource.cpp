@@ -67,7 +67,7 @@ void findBound(SourceContext& context, const std::string& bus, Drivers& drivers)
     if (found.name.empty()) {
       found.name = known->second;
     }
-    found.devices.push_back(bus + ":" + device);
+    found.devices.emplace_back(bus).append(1, ':').append(device);
   }
 }
 
