@@ -209,6 +209,7 @@ std::string unexpected(const CLI::App& app, const std::vector<std::string>& argu
     return "'" + first + "' is one argument too many";
   }
   std::vector<std::string> names;
+  names.reserve(commands.size());
   for (const Command command : commands) {
     names.emplace_back(commandName(command));
   }

@@ -6,7 +6,7 @@
 
 namespace cli {
 namespace {
-constexpr std::size_t pieceSize = 64 * 1024;
+constexpr std::size_t pieceSize = std::size_t{64} * 1024;
 }
 
 void Output::write(std::string_view text) {
