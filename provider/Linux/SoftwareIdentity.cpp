@@ -57,6 +57,7 @@ bool SoftwareIdentity::selectCurrentNodeType() {
   }
 }
 
+// NOLINTNEXTLINE(performance-unnecessary-value-param): callers hand over a copy of their own
 void SoftwareIdentity::setFilter(FilterType type, std::string value) {
   const TraceScope scope(loggerSoftwareIdentity, " filterType=", static_cast<unsigned int>(type),
                          " reference=", value);

@@ -77,7 +77,7 @@ char* format(Buffer& buffer, const char* pattern, Values... values) {
 #pragma GCC diagnostic push
 #pragma GCC diagnostic ignored "-Wformat-nonliteral"
 #pragma GCC diagnostic ignored "-Wformat-security"
-  std::snprintf(buffer, sizeof(buffer), pattern, values...);
+  static_cast<void>(std::snprintf(buffer, sizeof(buffer), pattern, values...));
 #pragma GCC diagnostic pop
   return buffer;
 }
