@@ -5,7 +5,6 @@
 namespace {
 
 using cimom::Instance;
-using cimom::ObjectPath;
 using dispatch_test::Answer;
 using dispatch_test::Dispatch;
 using testing::ElementsAre;

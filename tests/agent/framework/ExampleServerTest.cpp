@@ -17,7 +17,6 @@ namespace {
 
 using namespace Oru::NodeLexicon;
 using ::testing::Contains;
-using ::testing::Each;
 using ::testing::ElementsAre;
 
 class ExampleServer : public ::testing::Test {

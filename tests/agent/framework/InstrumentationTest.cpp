@@ -34,7 +34,6 @@ using Oru::Instrumentation;
 using Oru::InstrumentationException;
 using ::testing::ElementsAre;
 using ::testing::HasSubstr;
-using ::testing::IsEmpty;
 
 class TreeOfNumbers {
  public:

@@ -86,7 +86,8 @@ TEST(PathText, AgreesWithTheCLibraryAndReadsBack) {
   for (int i = 0; i < 100'000; ++i) {
     const NodeNumber number = random() >> (random() % 64);
     std::array<char, 32> expected{};
-    std::snprintf(expected.data(), expected.size(), "%llx", static_cast<unsigned long long>(number));
+    static_cast<void>(
+        std::snprintf(expected.data(), expected.size(), "%llx", static_cast<unsigned long long>(number)));
     ASSERT_EQ(pathText(number), expected.data());
     ASSERT_EQ(numberFromText(expected.data()), number);
   }
