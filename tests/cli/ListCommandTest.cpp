@@ -19,7 +19,6 @@ using cli_test::runOnTerminal;
 using cli_test::swinv;
 using cli_test::testFile;
 using testing::AllOf;
-using testing::Each;
 using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::Not;
