@@ -114,7 +114,7 @@ class Faults : public ProviderTest, public testing::WithParamInterface<Request> 
   }
 };
 
-static bool endsWithDone(const std::vector<std::string>& calls) {
+bool endsWithDone(const std::vector<std::string>& calls) {
   return calls.back() == "returnDone";
 }
 

@@ -36,7 +36,7 @@ TEST(InstanceId, TextsOfEveryLengthGoTogether) {
   const std::string digits = "fedcba9876543210";
   InstanceIdMaker maker;
   std::string instanceId;
-  for (std::size_t i = 0; i < 17 * 18; ++i) {
+  for (std::size_t i = 0; i < std::size_t{17} * 18; ++i) {
     const std::string parent = digits.substr(0, i * 5 % 17);
     const std::string node = std::string("0123456789abcdefg").substr(0, i * 7 % 18);
     std::uint64_t number = 0;

@@ -23,8 +23,9 @@ MonthDayYear scanByLibrary(const std::string& text) {
 
 std::string formatByLibrary(MonthDayYear date, long west) {
   char text[128];
-  std::snprintf(text, sizeof(text), "%4u%02u%02u%02u%02u%02u.%06u%1c%03u", date.year, date.month, date.day,
-                0U, 0U, 0U, 0U, west < 0 ? '-' : '+', static_cast<unsigned int>(std::labs(west / 60)));
+  static_cast<void>(std::snprintf(text, sizeof(text), "%4u%02u%02u%02u%02u%02u.%06u%1c%03u", date.year,
+                                  date.month, date.day, 0U, 0U, 0U, 0U, west < 0 ? '-' : '+',
+                                  static_cast<unsigned int>(std::labs(west / 60))));
   return std::string(text).substr(0, 25);
 }
 

@@ -84,8 +84,7 @@ TEST(StreamExtraction, ReadsTheCornersAsStreamsDo) {
                            "1,234 x",
                            "1.5e3",
                            "0 0 0",
-                           "\x80"
-                           "12",
+                           "\x80 12",
                            "1\x80@x"}) {
     compare(text);
   }
