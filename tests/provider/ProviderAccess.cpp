@@ -4,10 +4,10 @@
 
 namespace {
 
-constexpr int name = 108;
-constexpr int version = 307;
-constexpr int driverVersion = 134;
-constexpr int releaseDate = 164;
+constexpr int nameId = 108;
+constexpr int versionId = 307;
+constexpr int driverVersionId = 134;
+constexpr int releaseDateId = 164;
 
 std::vector<std::string> keysOf(const std::vector<const standin::Path*>& paths) {
   std::vector<std::string> keys;
@@ -21,12 +21,12 @@ std::vector<std::string> keysOf(const std::vector<const standin::Path*>& paths) 
 
 std::vector<standin::Node> sampleNodes() {
   return {
-      {40, "c0", "", "c0", "Computer System", {{name, "host"}}, {}},
+      {40, "c0", "", "c0", "Computer System", {{nameId, "host"}}, {}},
       {49, "1a", "c0", "c0", "Network Device", {}, {}},
-      {3, "f1", "1a", "c0", "Network Firmware", {{version, "7.1"}, {releaseDate, "12/31/2010"}}, {}},
-      {3, "f2", "c0", "c0", "BIOS", {{version, "2.0"}}, {{104, 2}, {107, 0}}},
-      {2, "b1", "c0", "c0", "System BIOS", {{version, "2.1"}}, {}},
-      {44, "d1", "c0", "c0", "first driver", {{driverVersion, "5.10"}}, {}},
+      {3, "f1", "1a", "c0", "Network Firmware", {{versionId, "7.1"}, {releaseDateId, "12/31/2010"}}, {}},
+      {3, "f2", "c0", "c0", "BIOS", {{versionId, "2.0"}}, {{104, 2}, {107, 0}}},
+      {2, "b1", "c0", "c0", "System BIOS", {{versionId, "2.1"}}, {}},
+      {44, "d1", "c0", "c0", "first driver", {{driverVersionId, "5.10"}}, {}},
       {44, "d2", "c0", "c0", "second driver", {}, {}},
   };
 }
