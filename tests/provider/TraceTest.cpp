@@ -46,8 +46,7 @@ TEST(Trace, VariablesOfBothKinds) {
 
 TEST(Trace, NullTextsPrintAsTheCLibraryPrintsThem) {
   const char* null = nullptr;
-  char expected[16];
-  std::snprintf(expected, sizeof(expected), "%s%s", "", std::string("(null)").c_str());
+  const std::string expected = "(null)";
   EXPECT_THAT(trace("v", "a.cpp", 7, null),
               StrEq(std::string("VARIABLE: 'v' has Value '") + expected + "' at line 7 in a.cpp"));
   EXPECT_THAT(trace(null, null, 7, ENTERING), StrEq("ENTERING: (null)() in (null) [Line: 7]"));
