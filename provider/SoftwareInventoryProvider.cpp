@@ -70,16 +70,11 @@ void walk(const CMPIContext* context, const CMPIResult* result, const CMPIObject
   CMReturnDone(result);
 }
 
-CMPIStatus refuse(CallSite site = CallSite::here()) {
+/// All that a function does which touches neither its arguments nor the result: it says that it was invoked.
+CMPIStatus answerAtOnce(CMPIrc code, CallSite site = CallSite::here()) {
   beginRequest();
   traceMethod({loggerSoftwareInventoryProvider, site});
-  return statusOf(CMPI_RC_ERR_NOT_SUPPORTED);
-}
-
-CMPIStatus acceptCleanup(CallSite site = CallSite::here()) {
-  beginRequest();
-  traceMethod({loggerSoftwareInventoryProvider, site});
-  return statusOf(CMPI_RC_OK);
+  return statusOf(code);
 }
 
 }  // namespace
@@ -108,7 +103,7 @@ bool getClassId(const char* className, const char* nameSpace, std::vector<std::u
 // ---- The instance interface.
 
 CMPIStatus SoftwareInventory_Cleanup(CMPIInstanceMI*, const CMPIContext*, CMPIBoolean) {
-  return acceptCleanup();
+  return answerAtOnce(CMPI_RC_OK);
 }
 
 CMPIStatus SoftwareInventory_EnumInstanceNames(CMPIInstanceMI*, const CMPIContext* context,
@@ -171,7 +166,7 @@ CMPIStatus SoftwareInventory_GetInstance(CMPIInstanceMI*, const CMPIContext* con
 
 CMPIStatus SoftwareInventory_CreateInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*,
                                             const CMPIObjectPath*, const CMPIInstance*) {
-  return refuse();
+  return answerAtOnce(CMPI_RC_ERR_NOT_SUPPORTED);
 }
 
 // Changes nothing and reports success: the broker's answer to the class name question becomes the status.
@@ -195,40 +190,40 @@ CMPIStatus SoftwareInventory_ModifyInstance(CMPIInstanceMI*, const CMPIContext*,
 
 CMPIStatus SoftwareInventory_DeleteInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*,
                                             const CMPIObjectPath*) {
-  return refuse();
+  return answerAtOnce(CMPI_RC_ERR_NOT_SUPPORTED);
 }
 
 CMPIStatus SoftwareInventory_ExecQuery(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*,
                                        const CMPIObjectPath*, const char*, const char*) {
-  return refuse();
+  return answerAtOnce(CMPI_RC_ERR_NOT_SUPPORTED);
 }
 
 // ---- The association interface.
 
 CMPIStatus SoftwareInventory_AssociationCleanup(CMPIAssociationMI*, const CMPIContext*, CMPIBoolean) {
-  return acceptCleanup();
+  return answerAtOnce(CMPI_RC_OK);
 }
 
 CMPIStatus SoftwareInventory_Associators(CMPIAssociationMI*, const CMPIContext*, const CMPIResult*,
                                          const CMPIObjectPath*, const char*, const char*, const char*,
                                          const char*, const char**) {
-  return refuse();
+  return answerAtOnce(CMPI_RC_ERR_NOT_SUPPORTED);
 }
 
 CMPIStatus SoftwareInventory_AssociatorNames(CMPIAssociationMI*, const CMPIContext*, const CMPIResult*,
                                              const CMPIObjectPath*, const char*, const char*, const char*,
                                              const char*) {
-  return refuse();
+  return answerAtOnce(CMPI_RC_ERR_NOT_SUPPORTED);
 }
 
 CMPIStatus SoftwareInventory_References(CMPIAssociationMI*, const CMPIContext*, const CMPIResult*,
                                         const CMPIObjectPath*, const char*, const char*, const char**) {
-  return refuse();
+  return answerAtOnce(CMPI_RC_ERR_NOT_SUPPORTED);
 }
 
 CMPIStatus SoftwareInventory_ReferenceNames(CMPIAssociationMI*, const CMPIContext*, const CMPIResult*,
                                             const CMPIObjectPath*, const char*, const char*) {
-  return refuse();
+  return answerAtOnce(CMPI_RC_ERR_NOT_SUPPORTED);
 }
 
 namespace {
