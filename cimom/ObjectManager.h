@@ -36,6 +36,14 @@ using PathSink = std::function<bool(const ObjectPath&)>;
 /// Names of properties to deliver; none: all.
 using PropertyList = std::optional<std::vector<std::string>>;
 
+/// What narrows an association request; an empty text narrows nothing. Names ignore case.
+struct AssociationQuery {
+  std::string associationClass;  ///< the association's class, or an ancestor of it
+  std::string resultClass;       ///< the class of the object at the far end, or an ancestor of it
+  std::string role;              ///< the association's reference to the source
+  std::string resultRole;        ///< the association's reference to the far end
+};
+
 class ObjectManager {
  public:
   /// Reads the schema. Throws `MofError` (file, line, what was expected), or `std::runtime_error` where a
@@ -69,6 +77,34 @@ class ObjectManager {
   /// keys do not fit the class, CMPI_RC_ERR_NOT_FOUND where the provider's answer is none, more than one, or
   /// one with other keys. `path` is a WBEM URI text (`formatWbemUri`), with or without the namespace.
   Outcome getInstance(std::string_view path, const PropertyList& properties, const InstanceSink& sink);
+
+  /// The objects at the far ends of the source's associations, or their paths. `path` names the source as in
+  /// `getInstance`; its class need not have a provider.
+  ///
+  /// The provider of each concrete class registered for associations, from `associationClass` down (none
+  /// given: of every one), is asked with that class's name, in the order of the schema. One that fails does
+  /// not keep the others from being asked; the first failure is the outcome. Where no class is registered,
+  /// the answer is empty. What a class delivers that one asked before it delivered too is left out; that
+  /// takes memory for the paths of the answer where several classes are asked, else none.
+  ///
+  /// Roles go by what stands in an association's references as its provider delivers them: the first path
+  /// that an enumeration of its names gives tells the class in each. It is enumerated once, when a request
+  /// first names one of its references as a role, and asked anew as long as it delivers none. Until
+  /// then, and for classes that stand in no reference of that path, the declaration counts.
+  ///
+  /// CMPI_RC_ERR_INVALID_PARAMETER for a source whose text is no path, whose class the schema lacks or whose
+  /// keys do not fit it, an association class that the schema lacks or that is no association, and a result
+  /// class that it lacks; CMPI_RC_ERR_NOT_SUPPORTED from a provider without the operation; else as above.
+  Outcome associators(std::string_view path, const AssociationQuery& query, const PropertyList& properties,
+                      const InstanceSink& sink);
+  Outcome associatorNames(std::string_view path, const AssociationQuery& query, const PathSink& sink);
+
+  /// The associations that refer to the source, or their paths: as above, with `associationClass` as the
+  /// class of the answer. With a role, the reference of that name must hold the source. Result class and
+  /// result role mean nothing here.
+  Outcome references(std::string_view path, const AssociationQuery& query, const PropertyList& properties,
+                     const InstanceSink& sink);
+  Outcome referenceNames(std::string_view path, const AssociationQuery& query, const PathSink& sink);
 
  private:
   struct State;
