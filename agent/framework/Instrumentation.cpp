@@ -17,30 +17,31 @@ namespace {
 using agent::NodeTree;
 using Index = NodeTree::Index;
 
-/// What a cursor holds from its first selection on: the tree of that moment, and a walk over some of its
-/// nodes, which are an ascending run of one of the tree's own lists, or the one node of `single`.
+/// What a cursor holds from its first selection on: the tree of that moment, and a walk. What a walk selected
+/// is one of the tree's own ascending lists, or the one node of `single`; it goes over the run of it that
+/// passes the filter.
 struct Cursor {
   explicit Cursor(std::shared_ptr<const NodeTree> shared) : tree(std::move(shared)) {}
 
   void walk(std::span<const Index> nodes) {
-    begin = nodes.data();
-    current = begin;
-    end = begin + nodes.size();
+    selected = nodes;
+    current = nodes.data();
+    end = current + nodes.size();
   }
   void walkOne(Index node) {
     single = node;
     walk(std::span(&single, node == NodeTree::none ? 0 : 1));
   }
-  /// Narrows the walk to the nodes in [from, to).
+  /// Starts over, on those of the selected nodes that are in [from, to).
   void narrow(Index from, Index to) {
-    begin = std::lower_bound(begin, end, from);
-    end = std::lower_bound(begin, end, to);
-    current = begin;
+    const Index* const last = selected.data() + selected.size();
+    current = std::lower_bound(selected.data(), last, from);
+    end = std::lower_bound(current, last, to);
   }
   [[nodiscard]] bool isOnNode() const { return current != end; }
 
   std::shared_ptr<const NodeTree> tree;
-  const Index* begin = nullptr;
+  std::span<const Index> selected;
   const Index* current = nullptr;
   const Index* end = nullptr;
   Index single = NodeTree::none;
@@ -114,7 +115,7 @@ void applyFilter(Cursor& cursor, NodeLexicon::PathType type, const std::string& 
              (isComputer && type == NodeLexicon::ComputerPath)) {
     cursor.narrow(node + 1, tree.subtreeEnd(node));
   } else {
-    cursor.walk({});
+    cursor.narrow(0, 0);
   }
 }
 

@@ -183,7 +183,8 @@ inline std::optional<std::uint32_t> NodeTree::value(Index node, int property) co
   return found->textOrNumber.begin;
 }
 
-/// Two nodes of a tree were given the same number, or one the number 0 or 2^64-1.
+/// Two nodes of a tree were given the same number, or one the number 0 or 2^64-1. A node with the number of
+/// one above it would stand below itself: who climbs by paths would never come to a root.
 class DuplicateNumber : public std::runtime_error {
  public:
   using std::runtime_error::runtime_error;
@@ -204,7 +205,8 @@ class NodeTreeBuilder {
   using NumberMaker = NodeNumber (*)(int type, std::string_view position, std::uint32_t n);
 
   /// Adds a node below `parent` (an earlier handle, or `noParent`). `description` and `position` are taken
-  /// through `cleanText`. Throws `std::invalid_argument` for another parent and for a negative type.
+  /// through `cleanText`. Throws `std::invalid_argument` for another parent, which is what keeps parent links
+  /// from forming a cycle, and for a negative type.
   Handle add(Handle parent, int type, std::string_view position, std::string_view description);
   /// Replaces what `add` was given: for readers that meet a node's children before its own texts.
   void describe(Handle node, int type, std::string_view position, std::string_view description);

@@ -14,6 +14,27 @@ void checkType(int type) {
   }
 }
 
+/// A node in an error: its place in the order of adding or in the tree, and what it is.
+std::string named(std::string_view description, std::size_t node) {
+  return "node " + std::to_string(node) + " (\"" + cleanText(description) + "\")";
+}
+
+[[noreturn]] void refuseNumber(const NodeTree& tree, NodeTree::Index node, NodeNumber number) {
+  const std::string text = "node number " + pathText(number);
+  if (number == noNumber || number == overflowNumber) {
+    throw DuplicateNumber(text + ", given to " + named(tree.description(node), node) +
+                          ", is reserved and names no node");
+  }
+  NodeTree::Index earlier = 0;
+  while (tree.number(earlier) != number) {
+    ++earlier;
+  }
+  const bool isBelow = node < tree.subtreeEnd(earlier);
+  throw DuplicateNumber(text + " is given to " + named(tree.description(earlier), earlier) + " and to " +
+                        named(tree.description(node), node) +
+                        (isBelow ? " below it: their parent links would form a cycle" : ""));
+}
+
 }  // namespace
 
 NodeTree::TextRange NodeTreeBuilder::keep(std::string_view text) {
@@ -30,7 +51,10 @@ NodeTree::TextRange NodeTreeBuilder::keep(std::string_view text) {
 NodeTreeBuilder::Handle NodeTreeBuilder::add(Handle parent, int type, std::string_view position,
                                              std::string_view description) {
   if (parent != noParent && parent >= drafts_.size()) {
-    throw std::invalid_argument("a node's parent must be added before the node");
+    throw std::invalid_argument(named(description, drafts_.size()) + " cannot stand below node " +
+                                std::to_string(parent) +
+                                ", which is not there yet: parents are added before what is below them, so "
+                                "that no node stands below itself");
   }
   if (drafts_.size() >= NodeTree::none) {
     throw std::length_error("a node tree has too many nodes");
@@ -203,9 +227,7 @@ void NodeTreeBuilder::giveNumbers(NodeTree& tree, const std::vector<Handle>& ord
       continue;
     }
     if (!taken.insert(*given).second) {
-      const bool isReserved = *given == noNumber || *given == overflowNumber;
-      throw DuplicateNumber("node number " + pathText(*given) +
-                            (isReserved ? " is reserved and names no node" : " is given to two nodes"));
+      refuseNumber(tree, index, *given);
     }
     tree.nodes_[index].number = *given;
   }

@@ -32,8 +32,10 @@ class Instrumentation {
   /// Stands on the node with that path; on no node when there is none. It is a walk of that one node.
   void selectNode(const std::string& path);
 
-  /// Narrows the current walk to what `type` and `path` name and stands on its first node that passes. Where
-  /// nothing passes, a framework throws `Oru::InstrumentationException`.
+  /// Narrows what was selected to what `type` and `path` name, and stands on the first node that passes: a
+  /// walk is what was selected under one filter, the last that was set. It starts over however far the cursor
+  /// had come, from past the end too. Where nothing passes, a framework throws
+  /// `Oru::InstrumentationException`.
   void setFilter(NodeLexicon::PathType type, const std::string& path);
 
   /// True while the cursor stands on a node.

@@ -250,16 +250,28 @@ TEST_F(InstrumentationTest, UnknownPathTypePassesNothing) {
   expectOnNoNode(cursor);
 }
 
-TEST_F(InstrumentationTest, FiltersNarrowOneAfterTheOther) {
+TEST_F(InstrumentationTest, LaterFilterReplacesTheOneBefore) {
   cursor.selectNode(FirmwareNode);
-  cursor.setFilter(ComputerPath, "1");
-  cursor.setFilter(ParentPath, "c2");
-  EXPECT_EQ(cursor.getPathToNode(), "b2");
   cursor.setFilter(ExactPath, "f3");
   EXPECT_THAT(restOf(cursor), ElementsAre("f3"));
-  EXPECT_NE(messageOfFilter(cursor, ParentPath, "d1"), "") << "f1 was narrowed away before";
-  EXPECT_NE(messageOfFilter(cursor, ParentPath, "1"), "") << "and nothing is left to narrow";
+  cursor.setFilter(ParentPath, "d1");
+  EXPECT_THAT(restOf(cursor), ElementsAre("f1")) << "f1 did not pass the filter before";
+  cursor.setFilter(ComputerPath, "1");
+  EXPECT_THAT(restOf(cursor), ElementsAre("b1", "f1", "b2", "f3"));
+  cursor.setFilter(ParentPath, "c2");
+  EXPECT_THAT(restOf(cursor), ElementsAre("b2", "f3"));
+  EXPECT_NE(messageOfFilter(cursor, ParentPath, "a1"), "") << "ports are no firmware, whatever the filter";
   expectOnNoNode(cursor);
+}
+
+TEST_F(InstrumentationTest, FilterThatNothingPassesLeavesTheWalkForTheNext) {
+  cursor.selectNode(FirmwareNode);
+  for (const char* path : {"d2", "xyz"}) {
+    EXPECT_NE(messageOfFilter(cursor, ParentPath, path), "");
+    expectOnNoNode(cursor);
+    cursor.setFilter(ParentPath, "d1");
+    EXPECT_THAT(restOf(cursor), ElementsAre("f1"));
+  }
 }
 
 TEST_F(InstrumentationTest, FilterStartsAtTheFirstNodeThatPassesWhereverTheCursorStood) {
@@ -271,6 +283,10 @@ TEST_F(InstrumentationTest, FilterStartsAtTheFirstNodeThatPassesWhereverTheCurso
   restOf(cursor);
   cursor.setFilter(ParentPath, "d1");
   EXPECT_EQ(cursor.getPathToNode(), "f1") << "also from past the end of the walk";
+  restOf(cursor);
+  expectOnNoNode(cursor);
+  cursor.setFilter(ParentPath, "d1");
+  EXPECT_THAT(restOf(cursor), ElementsAre("f1")) << "under the same filter, too";
 }
 
 TEST_F(InstrumentationTest, FilterNarrowsTheWalkOfOneNode) {
@@ -281,6 +297,8 @@ TEST_F(InstrumentationTest, FilterNarrowsTheWalkOfOneNode) {
   EXPECT_TRUE(isOnNode(cursor));
   EXPECT_NE(messageOfFilter(cursor, ParentPath, "d2"), "");
   expectOnNoNode(cursor);
+  cursor.setFilter(ComputerPath, "1");
+  EXPECT_THAT(restOf(cursor), ElementsAre("f1"));
 }
 
 TEST_F(InstrumentationTest, PropertyOfTheOtherKindIsNotThere) {

@@ -120,6 +120,14 @@ INSTANTIATE_TEST_SUITE_P(
              "server.json:3: nodes[0].id: " + ids + "\"10000000000000000\""},
         Case{"IdTwice", withNodes("{\"type\": 3,\n\"id\": \"1a\"},\n{\"type\": 3, \"id\": \"01A\"}"),
              "server.json:5: nodes[1].id: the number 1a is that of another node already, on server.json:4"},
+        Case{"IdOfTheNodeAbove",
+             withNodes("{\"type\": 49, \"id\": \"1a\",\n\"children\": [{\"type\": 3, \"children\": [\n"
+                       "{\"type\": 3, \"id\": \"1a\"}]}]}"),
+             "server.json:5: nodes[0].children[0].children[0].id: the number 1a is that of another node "
+             "already, on server.json:3"},
+        Case{"IdOfANodeBelow",
+             withNodes("{\"type\": 49, \"children\": [{\"type\": 3, \"id\": \"1a\"}],\n\"id\": \"1a\"}"),
+             "server.json:4: nodes[0].id: the number 1a is that of another node already, on server.json:3"},
         Case{"LongText", withNodes("{\"type\": \"" + std::string(50, 'x') + "\"}"),
              "server.json:3: nodes[0].type: expected a node type name or number, got \"" +
                  std::string(40, 'x') + "...\""}),

@@ -237,15 +237,65 @@ TEST(NodeNumbers, GivenOutrightGoBeforeMadeOnes) {
   EXPECT_EQ(tree.number(1), numberFor(FirmwareNode, "a"));
 }
 
-TEST(NodeNumbers, GivenTwiceAreRefused) {
-  NodeTreeBuilder builder;
-  builder.setNumber(builder.add(noParent, FirmwareNode, "a", ""), 0x1a);
-  builder.setNumber(builder.add(noParent, FirmwareNode, "b", ""), 0x1a);
+std::string messageOfBuild(NodeTreeBuilder& builder) {
   try {
     builder.build();
-    FAIL() << "two nodes with one number";
   } catch (const DuplicateNumber& error) {
-    EXPECT_THAT(error.what(), HasSubstr("1a"));
+    return error.what();
+  }
+  return "no error";
+}
+
+TEST(NodeNumbers, GivenTwiceAreRefused) {
+  NodeTreeBuilder builder;
+  builder.setNumber(builder.add(noParent, FirmwareNode, "a", "Drive"), 0x1a);
+  builder.setNumber(builder.add(noParent, FirmwareNode, "b", "BIOS"), 0x1a);
+  EXPECT_EQ(messageOfBuild(builder),
+            "node number 1a is given to node 0 (\"Drive\") and to node 1 (\"BIOS\")");
+  builder.setNumber(builder.add(noParent, FirmwareNode, "a", "Drive"), noNumber);
+  EXPECT_EQ(messageOfBuild(builder),
+            "node number 0, given to node 0 (\"Drive\"), is reserved and names no node");
+}
+
+// A parent is named by a handle when a tree is made, and by its number's path when it is climbed.
+
+TEST(ParentLinks, ThatWouldFormACycleByHandlesAreRefused) {
+  NodeTreeBuilder builder;
+  const auto device = builder.add(noParent, NetworkDeviceNode, "a", "Network Device");
+  for (const auto parent : {device + 1, device + 2}) {  // itself, and one that could then be put below it
+    try {
+      builder.add(parent, FirmwareNode, "b", "Network\nFirmware");
+      FAIL() << "a node below " << parent;
+    } catch (const std::invalid_argument& error) {
+      EXPECT_THAT(error.what(), HasSubstr("node 1 (\"Network Firmware\") cannot stand below node " +
+                                          std::to_string(parent) + ", which is not there yet"));
+    }
+  }
+  EXPECT_EQ(builder.build().size(), 1U);
+}
+
+TEST(ParentLinks, ThatWouldFormACycleByNumbersAreRefused) {
+  NodeTreeBuilder builder;
+  const auto device = builder.add(noParent, NetworkDeviceNode, "a", "Network Device");
+  const auto firmware = builder.add(device, FirmwareNode, "b", "Network Firmware");
+  const auto part = builder.add(firmware, FirmwareNode, "c", "Boot Code");
+  builder.setNumber(device, 0x1a);
+  builder.setNumber(firmware, 0x1b);
+  builder.setNumber(part, 0x1a);
+  EXPECT_EQ(messageOfBuild(builder),
+            "node number 1a is given to node 0 (\"Network Device\") and to node 2 "
+            "(\"Boot Code\") below it: their parent links would form a cycle");
+}
+
+TEST(ParentLinks, LeadToARootFromEachNodeByNumbers) {
+  for (std::uint64_t seed = 0; seed < 100; ++seed) {
+    const NodeTree tree = testing::RandomTree(seed).make(100);
+    for (NodeTree::Index node = 0; node < tree.size(); ++node) {
+      std::size_t steps = 0;
+      for (auto at = node; tree.parent(at) != NodeTree::none; at = tree.find(tree.number(tree.parent(at)))) {
+        ASSERT_LT(++steps, tree.size());
+      }
+    }
   }
 }
 
