@@ -42,7 +42,9 @@ std::string describe(const CMPIData& data) {
 Peer::Peer(const std::filesystem::path& build, const std::string& provider) {
   cimom::Configuration configuration;
   const std::filesystem::path schema = build / "share/swinv/schema";
-  configuration.schema = {schema / "CIM_Core.mof", schema / "KELVO_SoftwareInventory.mof"};
+  for (const char* file : {"CIM_Software.mof", "CIM_System.mof", "CIM_Device.mof", "KELVO_Endpoints.mof",
+                           "KELVO_SoftwareInventory.mof"})
+    configuration.schema.push_back(schema / file);
   configuration.providerFolder = build / "lib";
   cimom::ProviderRegistration registration;
   registration.className = className;

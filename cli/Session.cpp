@@ -35,17 +35,6 @@ std::vector<fs::path> schemaFiles(const fs::path& folder, const char* extension)
   return files;
 }
 
-/// The part of the CIM schema first, which includes what it needs, then this system's own classes.
-std::vector<fs::path> mofFiles(const fs::path& folder) {
-  std::vector<fs::path> files{folder / "CIM_Core.mof"};
-  for (const fs::path& file : schemaFiles(folder, ".mof")) {
-    if (!file.filename().string().starts_with("CIM_")) {
-      files.push_back(file);
-    }
-  }
-  return files;
-}
-
 cimom::Configuration configure(const Options& options) {
   std::error_code error;
   if (options.provider && !fs::exists(*options.provider, error)) {
@@ -54,7 +43,9 @@ cimom::Configuration configure(const Options& options) {
   }
   const Layout layout = ownLayout();
   cimom::Configuration configuration;
-  configuration.schema = mofFiles(layout.schema);
+  // In the order of their names: the CIM schema's files, which include what they stand on, before this
+  // system's.
+  configuration.schema = schemaFiles(layout.schema, ".mof");
   configuration.providerFolder = layout.libraries;
   for (const fs::path& file : schemaFiles(layout.schema, ".reg")) {
     for (cimom::ProviderRegistration& registration : cimom::readRegistrations(file)) {
