@@ -20,8 +20,9 @@
 
 namespace Oru::SoftwareInventoryProfileProvider {
 
-/// Class id of KELVO_SoftwareIdentity, an end of each association.
+/// KELVO_SoftwareIdentity, an end of each association.
 inline constexpr std::uint16_t softwareIdentityClassId = 2;
+inline constexpr const char* softwareIdentityClassName = "KELVO_SoftwareIdentity";
 
 /// One end of an association.
 enum class End { Element, Software };
@@ -84,6 +85,11 @@ class AssociationAdapter {
   /// The keys of a moniker, written into a path.
   static CMPIObjectPath* withKeys(CMPIObjectPath* path, Moniker moniker);
 
+  /// The calling function, as one of the adapter's own.
+  [[nodiscard]] LogPoint point(CallSite site = CallSite::here()) const {
+    return {table.logger, {site.function, table.place.file, table.place.line}};
+  }
+
   // The direction.
   [[nodiscard]] bool isSoftwareGiven() const { return requestedClassId == softwareIdentityClassId; }
   [[nodiscard]] bool isElementGiven() const { return requestedClassId == table.elementClassId; }
@@ -99,9 +105,6 @@ class AssociationAdapter {
   Resolver resolver;
 
  private:
-  [[nodiscard]] LogPoint point(CallSite site = CallSite::here()) const {
-    return {table.logger, {site.function, table.place.file, table.place.line}};
-  }
   CMPIObjectPath* pathOf(End end);
 };
 

@@ -26,9 +26,11 @@ class FirmwareAssociation : public AssociationAdapter<CMPISIComputerSystem, Reso
   /// The resolver's operation from computer to firmware.
   using FirmwareOf = Moniker (Resolver::*)(Moniker&);
 
-  FirmwareAssociation(const AssociationTable& table, FirmwareOf firmwareOf, const CMPIBroker* broker,
-                      const CMPIContext* context, const CMPIObjectPath* objectPath)
-      : AssociationAdapter<CMPISIComputerSystem, Resolver>(table, broker, context, objectPath),
+  FirmwareAssociation(const AssociationTable& associationTable, FirmwareOf firmwareOf,
+                      const CMPIBroker* objectManager, const CMPIContext* requestContext,
+                      const CMPIObjectPath* objectPath)
+      : AssociationAdapter<CMPISIComputerSystem, Resolver>(associationTable, objectManager, requestContext,
+                                                           objectPath),
         firmwareOf_(firmwareOf) {}
   ~FirmwareAssociation() = default;
 
@@ -42,5 +44,60 @@ class FirmwareAssociation : public AssociationAdapter<CMPISIComputerSystem, Reso
  private:
   FirmwareOf firmwareOf_;
 };
+
+template <typename Resolver>
+void FirmwareAssociation<Resolver>::setUpAssociation(const CMPIObjectPath* objectPath) {
+  this->elementEnd.setObjectPath(locateComputer(objectPath), false);
+  this->softwareIdentityEnd.setObjectPath(locateIdentity(this->elementEnd.getObjectPath()));
+}
+
+template <typename Resolver>
+void FirmwareAssociation<Resolver>::setUpFromComputer(const CMPIObjectPath* objectPath) {
+  this->softwareIdentityEnd.setObjectPath(locateIdentity(objectPath));
+}
+
+template <typename Resolver>
+void FirmwareAssociation<Resolver>::setUpFromSoftware(const CMPIObjectPath* objectPath) {
+  this->elementEnd.setObjectPath(locateComputer(objectPath), false);
+}
+
+template <typename Resolver>
+CMPIObjectPath* FirmwareAssociation<Resolver>::locateComputer(const CMPIObjectPath* objectPath) {
+  const TraceScope scope(this->point(), " objectPath=", objectPath);
+  return this->locate(this->table.elementClassName, objectPath,
+                      [this](Moniker& firmware) { return this->resolver.getComputerMoniker(firmware); });
+}
+
+template <typename Resolver>
+CMPIObjectPath* FirmwareAssociation<Resolver>::locateIdentity(const CMPIObjectPath* objectPath) {
+  const TraceScope scope(this->point(), " objectPath=", objectPath);
+  return this->locate(softwareIdentityClassName, objectPath,
+                      [this](Moniker& computer) { return (this->resolver.*firmwareOf_)(computer); });
+}
+
+template <typename Resolver>
+FirmwareAssociation<Resolver>::operator bool() {
+  const TraceScope scope(this->point());
+  if (this->isSoftwareGiven()) {
+    return static_cast<bool>(this->elementEnd);
+  }
+  if (this->isElementGiven()) {
+    return static_cast<bool>(this->softwareIdentityEnd);
+  }
+  return this->isAssociationGiven() && this->elementEnd && this->softwareIdentityEnd;
+}
+
+template <typename Resolver>
+void FirmwareAssociation<Resolver>::operator++() {
+  const TraceScope scope(this->point());
+  if (this->isSoftwareGiven()) {
+    ++this->elementEnd;
+  } else if (this->isElementGiven()) {
+    ++this->softwareIdentityEnd;
+  } else if (this->isAssociationGiven()) {
+    ++this->softwareIdentityEnd;
+    ++this->elementEnd;
+  }
+}
 
 }  // namespace Oru::SoftwareInventoryProfileProvider

@@ -5,8 +5,13 @@
 #include <cmpi/cmpimacs.h>
 
 #include <atomic>
+#include <cstring>
 #include <exception>
 
+#include "CMPIBIOSSoftwareIdentity.h"
+#include "CMPIBMCSoftwareIdentity.h"
+#include "CMPIInstalledSoftwareIdentity.h"
+#include "CMPINetworkSoftwareIdentity.h"
 #include "CMPISoftwareIdentity.h"
 
 namespace Oru::SoftwareInventoryProfileProvider {
@@ -29,12 +34,34 @@ enum ClassId : std::uint16_t {
   UnknownClass = 255,
 };
 
+/// What a null among the answers does to the object manager. The small-footprint broker ends the provider's
+/// process on one, so that nulls are left out for it; every other gets them.
+std::atomic<bool> nullsAreLeftOut{false};
+
+/// The name by which the small-footprint broker is known in its function table.
+constexpr const char* smallFootprintBroker = "RequestHandler";
+
 // Object managers may call a factory again while requests run.
 void storeBroker(const CMPIBroker* newBroker) {
+  const char* name = newBroker != nullptr && newBroker->bft != nullptr ? newBroker->bft->brokerName : nullptr;
+  nullsAreLeftOut.store(name != nullptr && std::strcmp(name, smallFootprintBroker) == 0,
+                        std::memory_order_relaxed);
   std::atomic_ref(broker).store(newBroker, std::memory_order_relaxed);
 }
 const CMPIBroker* currentBroker() {
   return std::atomic_ref(broker).load(std::memory_order_relaxed);
+}
+
+/// Hands an object on, a null like any other where the object manager bears it.
+void deliver(const CMPIResult* result, const CMPIObjectPath* path) {
+  if (path != nullptr || !nullsAreLeftOut.load(std::memory_order_relaxed)) {
+    CMReturnObjectPath(result, path);
+  }
+}
+void deliver(const CMPIResult* result, const CMPIInstance* instance) {
+  if (instance != nullptr || !nullsAreLeftOut.load(std::memory_order_relaxed)) {
+    CMReturnInstance(result, instance);
+  }
 }
 
 CMPIStatus statusOf(CMPIrc code) {
@@ -59,15 +86,48 @@ CMPIStatus answer(const CMPIObjectPath* path, Dispatch dispatch, CallSite site =
   return status;
 }
 
-/// Delivers each object of an adapter that is built from the request's path, then the done marker.
-template <typename Adapter, typename Deliver>
-void walk(const CMPIContext* context, const CMPIResult* result, const CMPIObjectPath* path, Deliver deliver) {
+/// Shows each position of an adapter that is built from the request's path.
+template <typename Adapter, typename Visit>
+void walk(const CMPIContext* context, const CMPIObjectPath* path, const Visit& visit) {
   Adapter adapter(currentBroker(), context, path);
   while (adapter) {
-    deliver(adapter);
+    visit(adapter);
     ++adapter;
   }
-  CMReturnDone(result);
+}
+
+/// The same for the adapter of an association class. False for any other class.
+template <typename Visit>
+bool walkAssociation(unsigned short classId, const CMPIContext* context, const CMPIObjectPath* path,
+                     const Visit& visit) {
+  switch (classId) {
+    case InstalledSoftwareIdentityClass:
+      walk<CMPIInstalledSoftwareIdentity>(context, path, visit);
+      return true;
+    case NetworkSoftwareIdentityClass:
+      walk<CMPINetworkSoftwareIdentity>(context, path, visit);
+      return true;
+    case BMCSoftwareIdentityClass:
+      walk<CMPIBMCSoftwareIdentity>(context, path, visit);
+      return true;
+    case BIOSSoftwareIdentityClass:
+      walk<CMPIBIOSSoftwareIdentity>(context, path, visit);
+      return true;
+    default:
+      return false;
+  }
+}
+
+/// As above, for one of several association classes: an exception ends this walk and not the request.
+template <typename Visit>
+bool associate(unsigned short classId, const CMPIContext* context, const CMPIObjectPath* source,
+               const Visit& visit, CallSite site = CallSite::here()) {
+  try {
+    return walkAssociation(classId, context, source, visit);
+  } catch (const std::exception& exception) {
+    traceException({loggerSoftwareInventoryProvider, site}, exception);
+    return true;
+  }
 }
 
 /// All that a function does which touches neither its arguments nor the result: it says that it was invoked.
@@ -109,18 +169,18 @@ CMPIStatus SoftwareInventory_Cleanup(CMPIInstanceMI*, const CMPIContext*, CMPIBo
 CMPIStatus SoftwareInventory_EnumInstanceNames(CMPIInstanceMI*, const CMPIContext* context,
                                                const CMPIResult* result, const CMPIObjectPath* classPath) {
   return answer(classPath, [&](unsigned short classId, CMPIStatus& status) {
-    switch (classId) {
-      case SoftwareIdentityClass:
-      case SecondSoftwareIdentityClass:
-        walk<CMPISoftwareIdentity>(context, result, classPath, [&](CMPISoftwareIdentity& adapter) {
-          if (const CMPIObjectPath* path = adapter.getObjectPath()) {
-            CMReturnObjectPath(result, path);
-          }
-        });
-        break;
-      default:
-        status.rc = CMPI_RC_ERR_INVALID_CLASS;
+    if (classId == SoftwareIdentityClass || classId == SecondSoftwareIdentityClass) {
+      walk<CMPISoftwareIdentity>(context, classPath, [&](CMPISoftwareIdentity& adapter) {
+        if (const CMPIObjectPath* path = adapter.getObjectPath()) {
+          CMReturnObjectPath(result, path);
+        }
+      });
+    } else if (!walkAssociation(classId, context, classPath,
+                                [&](auto& adapter) { deliver(result, adapter.getObjectPath()); })) {
+      status.rc = CMPI_RC_ERR_INVALID_CLASS;
+      return;
     }
+    CMReturnDone(result);
   });
 }
 
@@ -128,39 +188,48 @@ CMPIStatus SoftwareInventory_EnumInstances(CMPIInstanceMI*, const CMPIContext* c
                                            const CMPIResult* result, const CMPIObjectPath* classPath,
                                            const char** properties) {
   return answer(classPath, [&](unsigned short classId, CMPIStatus& status) {
-    switch (classId) {
-      case SoftwareIdentityClass:
-      case SecondSoftwareIdentityClass:
-        walk<CMPISoftwareIdentity>(context, result, classPath, [&](CMPISoftwareIdentity& adapter) {
-          if (const CMPIInstance* instance = adapter.getCMPIInstance(properties)) {
-            CMReturnInstance(result, instance);
-          }
-        });
-        break;
-      default:
-        status.rc = CMPI_RC_ERR_INVALID_CLASS;
+    if (classId == SoftwareIdentityClass || classId == SecondSoftwareIdentityClass) {
+      walk<CMPISoftwareIdentity>(context, classPath, [&](CMPISoftwareIdentity& adapter) {
+        if (const CMPIInstance* instance = adapter.getCMPIInstance(properties)) {
+          CMReturnInstance(result, instance);
+        }
+      });
+    } else if (!walkAssociation(classId, context, classPath, [&](auto& adapter) {
+                 deliver(result, adapter.getCMPIInstance(properties));
+               })) {
+      status.rc = CMPI_RC_ERR_INVALID_CLASS;
+      return;
     }
+    CMReturnDone(result);
   });
 }
 
-// It delivers whatever the keys select and counts nothing: none is OK, too.
+// It delivers whatever the keys select and counts nothing: none is OK, too. Of the associations, those of
+// installed software alone can be fetched singly.
 CMPIStatus SoftwareInventory_GetInstance(CMPIInstanceMI*, const CMPIContext* context,
                                          const CMPIResult* result, const CMPIObjectPath* instancePath,
                                          const char** properties) {
   return answer(instancePath, [&](unsigned short classId, CMPIStatus& status) {
+    const auto deliverInstance = [&](auto& adapter) { deliver(result, adapter.getCMPIInstance(properties)); };
     switch (classId) {
       case SoftwareIdentityClass:
       case SecondSoftwareIdentityClass:
-        walk<CMPISoftwareIdentity>(context, result, instancePath, [&](CMPISoftwareIdentity& adapter) {
-          CMReturnInstance(result, adapter.getCMPIInstance(properties));
-        });
+        walk<CMPISoftwareIdentity>(context, instancePath, deliverInstance);
         break;
+      case InstalledSoftwareIdentityClass:
+        walk<CMPIInstalledSoftwareIdentity>(context, instancePath, deliverInstance);
+        break;
+      case NetworkSoftwareIdentityClass:
+      case BMCSoftwareIdentityClass:
+      case BIOSSoftwareIdentityClass:
       case RefusedClass:
         status.rc = CMPI_RC_ERR_NOT_SUPPORTED;
-        break;
+        return;
       default:
         status.rc = CMPI_RC_ERR_INVALID_CLASS;
+        return;
     }
+    CMReturnDone(result);
   });
 }
 
@@ -204,16 +273,71 @@ CMPIStatus SoftwareInventory_AssociationCleanup(CMPIAssociationMI*, const CMPICo
   return answerAtOnce(CMPI_RC_OK);
 }
 
-CMPIStatus SoftwareInventory_Associators(CMPIAssociationMI*, const CMPIContext*, const CMPIResult*,
-                                         const CMPIObjectPath*, const char*, const char*, const char*,
-                                         const char*, const char**) {
-  return answerAtOnce(CMPI_RC_ERR_NOT_SUPPORTED);
+namespace {
+
+/// Entry, the parameters that are worth a trace, and the class ids that the association class stands for. A
+/// class that stands for none is the status, and the answer is empty.
+std::vector<std::uint16_t> beginAssociation(const CMPIObjectPath* source, const char* associationClass,
+                                            const char* resultClass, CMPIStatus& status, CallSite site) {
+  const LogPoint point(loggerSoftwareInventoryProvider, site);
+  beginRequest();
+  markProviderEntry(loggerSoftwareInventoryProvider, site.function, site.file, site.line);
+  traceVariable(point, "resultClass", resultClass);
+  traceVariable(point, "associationClass", associationClass);
+  const std::string nameSpace = ProviderUtilities::getNamespace(source);
+  std::vector<std::uint16_t> ids;
+  if (!getClassId(associationClass, nameSpace.c_str(), ids)) {
+    traceVariable(point, "CMPI_RC_ERR_INVALID_CLASS", CMPI_RC_ERR_INVALID_CLASS);
+    status.rc = CMPI_RC_ERR_INVALID_CLASS;
+  }
+  return ids;
 }
 
-CMPIStatus SoftwareInventory_AssociatorNames(CMPIAssociationMI*, const CMPIContext*, const CMPIResult*,
-                                             const CMPIObjectPath*, const char*, const char*, const char*,
+CMPIStatus endAssociation(CMPIStatus status, CallSite site) {
+  markProviderExit(loggerSoftwareInventoryProvider, site.function, site.file, site.line);
+  return status;
+}
+
+}  // namespace
+
+// Result class and roles narrow nothing here: each association class has one class at its far end. An id
+// without an adapter ends the request at once, without the done marker.
+CMPIStatus SoftwareInventory_Associators(CMPIAssociationMI*, const CMPIContext* context,
+                                         const CMPIResult* result, const CMPIObjectPath* sourcePath,
+                                         const char* assocClass, const char* resultClass, const char*,
+                                         const char*, const char** properties) {
+  const CallSite site = CallSite::here();
+  CMPIStatus status = statusOf(CMPI_RC_OK);
+  for (const std::uint16_t id : beginAssociation(sourcePath, assocClass, resultClass, status, site)) {
+    if (!associate(id, context, sourcePath,
+                   [&](auto& adapter) { deliver(result, adapter.getAssociator(properties)); })) {
+      status.rc = CMPI_RC_ERR_INVALID_CLASS;
+      return endAssociation(status, site);
+    }
+  }
+  CMReturnDone(result);
+  return endAssociation(status, site);
+}
+
+CMPIStatus SoftwareInventory_AssociatorNames(CMPIAssociationMI*, const CMPIContext* context,
+                                             const CMPIResult* result, const CMPIObjectPath* sourcePath,
+                                             const char* assocClass, const char* resultClass, const char*,
                                              const char*) {
-  return answerAtOnce(CMPI_RC_ERR_NOT_SUPPORTED);
+  const CallSite site = CallSite::here();
+  CMPIStatus status = statusOf(CMPI_RC_OK);
+  for (const std::uint16_t id : beginAssociation(sourcePath, assocClass, resultClass, status, site)) {
+    const bool rcode = associate(id, context, sourcePath,
+                                 [&](auto& adapter) { deliver(result, adapter.getAssociatorNames()); });
+    traceVariable(loggerSoftwareInventoryProvider, "rcode", rcode);
+    if (!rcode) {
+      status.rc = CMPI_RC_ERR_INVALID_CLASS;
+      // Said again as the reason to leave.
+      traceVariable(loggerSoftwareInventoryProvider, "rcode", rcode);
+      return endAssociation(status, site);
+    }
+  }
+  CMReturnDone(result);
+  return endAssociation(status, site);
 }
 
 CMPIStatus SoftwareInventory_References(CMPIAssociationMI*, const CMPIContext*, const CMPIResult*,

@@ -9,10 +9,18 @@
 
 namespace Oru::SoftwareInventoryProfileProvider {
 
+namespace {
+
+std::uint64_t numberOf(const std::string& pathText) {
+  const auto digits = numberOfHexadecimalDigits(pathText);
+  return digits ? *digits : StreamExtraction(pathText).hexadecimal();
+}
+
+}  // namespace
+
 void InstanceIdMaker::make(const std::string& parentText, const std::string& nodeText,
                            std::string& instanceId) {
-  const auto digits = numberOfHexadecimalDigits(parentText);
-  const std::uint64_t parent = digits ? *digits : StreamExtraction(parentText).hexadecimal();
+  const std::uint64_t parent = numberOf(parentText);
   if (parent != parent_) {
     parent_ = parent;
     prefixLength_ = DecimalText(parent).view().copy(prefix_.data(), prefix_.size() - 1);
@@ -32,6 +40,10 @@ void InstanceIdMaker::make(const std::string& parentText, const std::string& nod
     std::memcpy(instanceId.data(), prefix_.data(), prefix_.size());
   }
   std::memcpy(instanceId.data() + prefixLength_, nodeText.data(), usualLength + 1);
+}
+
+std::string nodeNumber(const std::string& pathText) {
+  return std::string(DecimalText(numberOf(pathText)).view());
 }
 
 InstanceIdParts parseInstanceId(std::string_view instanceId) {

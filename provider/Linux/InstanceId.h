@@ -33,6 +33,9 @@ struct InstanceIdParts {
 };
 InstanceIdParts parseInstanceId(std::string_view instanceId);
 
+/// The number of the node with this path text, in decimal: what an InstanceID of its children begins with.
+std::string nodeNumber(const std::string& pathText);
+
 /// The path text of the parent that an identifier begins with: its decimal number in lower-case hexadecimal.
 /// What does not begin with a number counts as 0.
 std::string parentPathText(std::string_view identifier);

@@ -5,7 +5,8 @@
 // channel, nothing is formatted for it. A call site says an event once; function, file and line come by
 // themselves, the file relative to provider/ by the compiler's prefix map.
 //
-// `TraceScope` says entry and exit, with parameters where there are any; `traceMethod` that a function which
+// `TraceScope` says entry and exit, with parameters at entry where there are any, `ParameterScope` with
+// parameters at both; `traceMethod` that a function which
 // does little was invoked; `traceMessage`, `traceVariable` and `traceException` say what they are named
 // after, the last at the error level.
 //
@@ -23,6 +24,7 @@
 #include <locale>
 #include <sstream>
 #include <string>
+#include <tuple>
 
 namespace Oru::SoftwareInventoryProfileProvider {
 
@@ -316,6 +318,45 @@ class TraceScope {
 
   LogPoint point_;
   int exceptionsAtEntry_ = notTraced;
+};
+
+/// One ENTERING or EXITING event with parameters, at a level of the function's own.
+template <typename... Parameters>
+void traceEntering(const LogPoint& point, int level, const Parameters&... parameters) {
+  if (trace_detail::mayBeOn(level)) {
+    trace_detail::emitEvent(point, level, ENTERING, trace_detail::parameterList(parameters...));
+  }
+}
+template <typename... Parameters>
+void traceExiting(const LogPoint& point, int level, const Parameters&... parameters) {
+  if (trace_detail::mayBeOn(level)) {
+    trace_detail::emitEvent(point, level, EXITING, trace_detail::parameterList(parameters...));
+  }
+}
+
+/// Entry and exit of a function whose parameters are of interest at both: otherwise as `TraceScope`. The
+/// parameters must outlive the scope.
+template <typename... Parameters>
+class ParameterScope {
+ public:
+  explicit ParameterScope(const LogPoint& point, const Parameters&... parameters)
+      : point_(point), parameters_(parameters...) {
+    traceEntering(point_, routineLevel, parameters...);
+  }
+
+  ~ParameterScope() {
+    if (std::uncaught_exceptions() <= exceptionsAtEntry_) {
+      std::apply([this](const auto&... each) { traceExiting(point_, routineLevel, each...); }, parameters_);
+    }
+  }
+
+  ParameterScope(const ParameterScope&) = delete;
+  ParameterScope& operator=(const ParameterScope&) = delete;
+
+ private:
+  LogPoint point_;
+  std::tuple<const Parameters&...> parameters_;
+  int exceptionsAtEntry_ = std::uncaught_exceptions();
 };
 
 /// The banner at the start of every function of the provider interface that does real work: the separator
