@@ -11,23 +11,11 @@ std::optional<std::vector<std::string_view>> propertyNames(const char** properti
   return names;
 }
 
-void Delivery::startRoute(const Routes& routes, const Route& route, const ClassInfo& requested,
-                          std::string_view nameSpace) {
-  routes_ = &routes;
-  route_ = &route;
-  requested_ = &requested;
-  nameSpace_ = nameSpace;
-  strangers_ = 0;
-}
-
-bool Delivery::isWanted(Enumerated what, const ClassInfo* info, std::string_view className) {
-  if (info == route_->info && what == what_)
-    return true;
-  if (what == what_ && info != nullptr && info->isA(*requested_))
-    return routes_->responsible(nameSpace_, *info) == route_;
-  if (strangers_++ == 0)
-    strangersClass_ = className;
-  return false;
+bool Delivery::isWanted(Kind given, const ObjectPath& path, const Instance* instance) {
+  const Verdict verdict = given == kind_ ? judge(path, instance) : Verdict::Stranger;
+  if (verdict == Verdict::Stranger && strangers_++ == 0)
+    strangersClass_ = path.className();
+  return verdict == Verdict::Wanted;
 }
 
 template <class Action>
@@ -45,7 +33,7 @@ bool Delivery::handOn(const Action& action) {
 }
 
 bool Delivery::instance(Instance& instance) {
-  if (!isWanted(Enumerated::Instances, &instance.classInfo(), instance.className()))
+  if (!isWanted(Kind::Instances, instance.path(), &instance))
     return open_;
   return handOn([this, &instance] {
     if (!properties_)
@@ -59,7 +47,7 @@ bool Delivery::instance(Instance& instance) {
 }
 
 bool Delivery::path(ObjectPath& path) {
-  if (!isWanted(Enumerated::Names, path.classInfo(), path.className()))
+  if (!isWanted(Kind::Names, path, nullptr))
     return open_;
   return handOn([this, &path] { return receiver_.path(path); });
 }
@@ -67,6 +55,25 @@ bool Delivery::path(ObjectPath& path) {
 void Delivery::rethrow() const {
   if (thrown_ != nullptr)
     std::rethrow_exception(thrown_);
+}
+
+void EnumerationDelivery::startRoute(const Routes& routes, const Route& route, const ClassInfo& requested,
+                                     std::string_view nameSpace) {
+  routes_ = &routes;
+  route_ = &route;
+  requested_ = &requested;
+  nameSpace_ = nameSpace;
+  forgetStrangers();
+}
+
+Delivery::Verdict EnumerationDelivery::judge(const ObjectPath& path, const Instance* /*instance*/) {
+  const ClassInfo* info = path.classInfo();
+  if (info == route_->info)
+    return Verdict::Wanted;
+  if (info == nullptr || !info->isA(*requested_))
+    return Verdict::Stranger;
+  const bool isOurs = routes_->responsible(nameSpace_, *info, operation_) == route_;
+  return isOurs ? Verdict::Wanted : Verdict::LeftOut;
 }
 
 }  // namespace cimom

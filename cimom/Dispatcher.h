@@ -4,46 +4,44 @@
 // Threads: requests may come from several at once.
 #pragma once
 
-#include <cimom/Delivery.h>
+#include <cimom/Associations.h>
 #include <cimom/Outcome.h>
+#include <cimom/ProviderCall.h>
 #include <cimom/Routes.h>
 #include <cimom/broker/Broker.h>
 #include <cimom/broker/Objects.h>
 #include <cimom/broker/Result.h>
 #include <cmpi/cmpidt.h>
 
-#include <functional>
 #include <string>
-#include <string_view>
+#include <utility>
 
 namespace cimom {
 
-/// What is asked, and by whom.
-struct Asked {
-  /// The class, its namespace, and keys: all of them for one instance; those of an enumeration are handed on.
-  const ObjectPath& path;
-  const char** properties = nullptr;  ///< as CMPI has them: null, or names ended by a null
-  const Context* context = nullptr;   ///< of the provider that asks; null for a client
-};
-
 class Dispatcher final : public UpcallTarget {
  public:
-  /// How deep providers may ask each other: each level takes stack and holds a request open.
-  static constexpr int deepestNesting = 16;
-
-  /// `log` may be empty.
-  explicit Dispatcher(std::function<void(std::string_view)> log) : log_(std::move(log)) {}
+  explicit Dispatcher(Log log) : log_(std::move(log)), associations_(*this) {}
 
   /// Called once, before the first request: the routes need the broker, which needs this.
   void setRoutes(const Routes& routes) { routes_ = &routes; }
 
   /// Asks the provider of the class and those of all classes below it, each with its own class name. A
   /// provider that fails does not keep the others from being asked; the first failure is the outcome.
-  Outcome enumerate(Enumerated what, const Asked& asked, ResultSink& sink) const;
+  Outcome enumerate(Kind kind, const Asked& asked, ResultSink& sink) const;
 
   /// CMPI_RC_ERR_INVALID_PARAMETER where the keys do not fit the class, CMPI_RC_ERR_NOT_FOUND for every
   /// answer but exactly the instance asked for.
   Outcome get(const Asked& asked, ResultSink& sink) const;
+
+  [[nodiscard]] const Associations& associations() const { return associations_; }
+
+  /// CMPI_RC_ERR_INVALID_NAMESPACE or CMPI_RC_ERR_INVALID_CLASS for a path whose namespace or class nobody
+  /// knows, CMPI_RC_ERR_FAILED where providers ask each other too deep.
+  [[nodiscard]] Status check(const ObjectPath& path) const;
+
+  [[nodiscard]] const Routes& routes() const { return *routes_; }
+  [[nodiscard]] const Log& log() const { return log_; }
+  void report(const std::string& line) const;
 
   UpcallStatus enumerateInstances(const Context& context, const ObjectPath& path, const char** properties,
                                   ResultSink& sink) override;
@@ -51,15 +49,21 @@ class Dispatcher final : public UpcallTarget {
                                       ResultSink& sink) override;
   UpcallStatus getInstance(const Context& context, const ObjectPath& path, const char** properties,
                            ResultSink& sink) override;
+  UpcallStatus associators(const Context& context, const ObjectPath& path, const AssociationFilter& filter,
+                           const char** properties, ResultSink& sink) override;
+  UpcallStatus associatorNames(const Context& context, const ObjectPath& path,
+                               const AssociationFilter& filter, ResultSink& sink) override;
+  UpcallStatus references(const Context& context, const ObjectPath& path, const AssociationFilter& filter,
+                          const char** properties, ResultSink& sink) override;
+  UpcallStatus referenceNames(const Context& context, const ObjectPath& path, const AssociationFilter& filter,
+                              ResultSink& sink) override;
 
  private:
-  [[nodiscard]] Status check(const ObjectPath& path) const;
-  Outcome enumerateRoute(Enumerated what, const Asked& asked, const Route& route, Delivery& delivery) const;
   Outcome getFrom(const Asked& asked, const Route& route, ResultSink& sink) const;
-  void report(const std::string& line) const;
 
-  std::function<void(std::string_view)> log_;
+  Log log_;
   const Routes* routes_ = nullptr;
+  Associations associations_;
 };
 
 }  // namespace cimom

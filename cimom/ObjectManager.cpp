@@ -69,6 +69,11 @@ class CmpiProperties {
   std::vector<const char*> names_;
 };
 
+AssociationFilter filterOf(const AssociationQuery& query) {
+  return {query.associationClass.c_str(), query.resultClass.c_str(), query.role.c_str(),
+          query.resultRole.c_str()};
+}
+
 }  // namespace
 
 struct ObjectManager::State {
@@ -88,6 +93,23 @@ struct ObjectManager::State {
     if (nameSpace.empty())
       nameSpace = routes.defaultNameSpace(className);
     return *ObjectPath::create(arena, broker.classes(), nameSpace, className);
+  }
+
+  /// Runs `request(path)` on the path that the text names.
+  template <class Request>
+  [[nodiscard]] Outcome onPath(std::string_view text, const Request& request) const {
+    Arena arena;
+    const ObjectPath* path = nullptr;
+    try {
+      path = parseWbemUri(arena, broker.classes(), text);
+      const std::string_view nameSpace =
+          path->nameSpace().empty() ? routes.defaultNameSpace(path->className()) : path->nameSpace();
+      // Once more, because the namespace is also that of the references in the keys.
+      path = parseWbemUri(arena, broker.classes(), text, nameSpace);
+    } catch (const WbemUriError& error) {
+      return {{CMPI_RC_ERR_INVALID_PARAMETER, error.what()}, false, 0};
+    }
+    return request(*path);
   }
 
   ClassRepository repository;
@@ -115,7 +137,7 @@ Outcome ObjectManager::enumerateInstances(std::string_view nameSpace, std::strin
   InstanceReceiver client(sink);
   CmpiProperties list(properties);
   const ObjectPath& path = state_->classPath(arena, nameSpace, className);
-  return state_->dispatcher.enumerate(Enumerated::Instances, {path, list.get(), nullptr}, client);
+  return state_->dispatcher.enumerate(Kind::Instances, {path, list.get(), nullptr}, client);
 }
 
 Outcome ObjectManager::enumerateInstanceNames(std::string_view nameSpace, std::string_view className,
@@ -123,23 +145,54 @@ Outcome ObjectManager::enumerateInstanceNames(std::string_view nameSpace, std::s
   Arena arena;
   PathReceiver client(sink);
   const ObjectPath& path = state_->classPath(arena, nameSpace, className);
-  return state_->dispatcher.enumerate(Enumerated::Names, {path, nullptr, nullptr}, client);
+  return state_->dispatcher.enumerate(Kind::Names, {path, nullptr, nullptr}, client);
 }
 
 Outcome ObjectManager::getInstance(std::string_view path, const PropertyList& properties,
                                    const InstanceSink& sink) {
-  Arena arena;
   InstanceReceiver client(sink);
   CmpiProperties list(properties);
-  ObjectPath* asked = nullptr;
-  try {
-    asked = parseWbemUri(arena, state_->broker.classes(), path);
-  } catch (const WbemUriError& error) {
-    return {{CMPI_RC_ERR_INVALID_PARAMETER, error.what()}, false, 0};
-  }
-  if (asked->nameSpace().empty())
-    asked->setNameSpace(state_->routes.defaultNameSpace(asked->className()));
-  return state_->dispatcher.get({*asked, list.get(), nullptr}, client);
+  return state_->onPath(path, [&](const ObjectPath& asked) {
+    return state_->dispatcher.get({asked, list.get(), nullptr}, client);
+  });
+}
+
+Outcome ObjectManager::associators(std::string_view path, const AssociationQuery& query,
+                                   const PropertyList& properties, const InstanceSink& sink) {
+  InstanceReceiver client(sink);
+  CmpiProperties list(properties);
+  return state_->onPath(path, [&](const ObjectPath& source) {
+    return state_->dispatcher.associations().associators(Kind::Instances, {source, list.get(), nullptr},
+                                                         filterOf(query), client);
+  });
+}
+
+Outcome ObjectManager::associatorNames(std::string_view path, const AssociationQuery& query,
+                                       const PathSink& sink) {
+  PathReceiver client(sink);
+  return state_->onPath(path, [&](const ObjectPath& source) {
+    return state_->dispatcher.associations().associators(Kind::Names, {source, nullptr, nullptr},
+                                                         filterOf(query), client);
+  });
+}
+
+Outcome ObjectManager::references(std::string_view path, const AssociationQuery& query,
+                                  const PropertyList& properties, const InstanceSink& sink) {
+  InstanceReceiver client(sink);
+  CmpiProperties list(properties);
+  return state_->onPath(path, [&](const ObjectPath& source) {
+    return state_->dispatcher.associations().references(Kind::Instances, {source, list.get(), nullptr},
+                                                        filterOf(query), client);
+  });
+}
+
+Outcome ObjectManager::referenceNames(std::string_view path, const AssociationQuery& query,
+                                      const PathSink& sink) {
+  PathReceiver client(sink);
+  return state_->onPath(path, [&](const ObjectPath& source) {
+    return state_->dispatcher.associations().references(Kind::Names, {source, nullptr, nullptr},
+                                                        filterOf(query), client);
+  });
 }
 
 }  // namespace cimom

@@ -2,6 +2,7 @@
 #include <cimom/Routes.h>
 
 #include <algorithm>
+#include <iterator>
 
 namespace cimom {
 
@@ -18,10 +19,22 @@ Routes::Routes(const ClassRepository& schema, const Broker& broker,
       auto found = std::find_if(nameSpaces_.begin(), nameSpaces_.end(),
                                 [&nameSpace](const auto& known) { return sameName(known.first, nameSpace); });
       if (found == nameSpaces_.end())
-        found = nameSpaces_.emplace(nameSpaces_.end(), nameSpace, ByClass());
-      if (!found->second.emplace(info, Route{info, each.instance, each.association, &serving}).second)
+        found = nameSpaces_.emplace(nameSpaces_.end(), nameSpace, NameSpace());
+      const Route route{info, schema_.find(info->name()), each.instance, each.association, &serving};
+      if (!found->second.byClass.emplace(info, route).second)
         throw RegistrationError(each.where + ": class " + each.className + " is registered twice in " +
                                 nameSpace);
+    }
+  }
+  listAssociations();
+}
+
+void Routes::listAssociations() {
+  for (auto& [name, space] : nameSpaces_) {
+    for (const SchemaClass* each : schema_.all()) {
+      const auto found = space.byClass.find(classes_.find(each->name()));
+      if (found != space.byClass.end() && found->second.association && !each->isAbstract())
+        space.associations.push_back(&found->second);
     }
   }
 }
@@ -41,7 +54,7 @@ ProviderLibrary& Routes::library(const ProviderRegistration& registration, const
   return *slot;
 }
 
-const Routes::ByClass* Routes::inNameSpace(std::string_view nameSpace) const {
+const Routes::NameSpace* Routes::inNameSpace(std::string_view nameSpace) const {
   const auto found = std::find_if(nameSpaces_.begin(), nameSpaces_.end(), [nameSpace](const auto& known) {
     return sameName(known.first, nameSpace);
   });
@@ -54,19 +67,19 @@ bool Routes::knowsNameSpace(std::string_view nameSpace) const {
 
 std::string_view Routes::defaultNameSpace(std::string_view className) const {
   const ClassInfo* info = classes_.find(className);
-  for (const auto& [name, routes] : nameSpaces_) {
-    if (routes.contains(info))
+  for (const auto& [name, space] : nameSpaces_) {
+    if (space.byClass.contains(info))
       return name;
   }
   return nameSpaces_.empty() ? std::string_view() : std::string_view(nameSpaces_.front().first);
 }
 
 const Route* Routes::find(std::string_view nameSpace, const ClassInfo& info) const {
-  const ByClass* routes = inNameSpace(nameSpace);
-  if (routes == nullptr)
+  const NameSpace* space = inNameSpace(nameSpace);
+  if (space == nullptr)
     return nullptr;
-  const auto found = routes->find(&info);
-  return found == routes->end() ? nullptr : &found->second;
+  const auto found = space->byClass.find(&info);
+  return found == space->byClass.end() ? nullptr : &found->second;
 }
 
 std::vector<const Route*> Routes::below(std::string_view nameSpace, const ClassInfo& top) const {
@@ -79,11 +92,22 @@ std::vector<const Route*> Routes::below(std::string_view nameSpace, const ClassI
   return result;
 }
 
-const Route* Routes::responsible(std::string_view nameSpace, const ClassInfo& info) const {
-  const Route* route = nullptr;
-  for (const ClassInfo* each = &info; each != nullptr && route == nullptr; each = each->superClass())
-    route = find(nameSpace, *each);
-  return route;
+std::vector<const Route*> Routes::associations(std::string_view nameSpace, const ClassInfo* top) const {
+  std::vector<const Route*> result;
+  if (const NameSpace* space = inNameSpace(nameSpace))
+    std::copy_if(space->associations.begin(), space->associations.end(), std::back_inserter(result),
+                 [top](const Route* route) { return top == nullptr || route->info->isA(*top); });
+  return result;
+}
+
+const Route* Routes::responsible(std::string_view nameSpace, const ClassInfo& info,
+                                 bool Route::*operation) const {
+  for (const ClassInfo* each = &info; each != nullptr; each = each->superClass()) {
+    const Route* route = find(nameSpace, *each);
+    if (route != nullptr && route->*operation)
+      return route;
+  }
+  return nullptr;
 }
 
 }  // namespace cimom

@@ -22,6 +22,7 @@ namespace cimom {
 /// One class and who serves it.
 struct Route {
   const ClassInfo* info = nullptr;
+  const SchemaClass* schema = nullptr;  ///< the same class, as declared
   bool instance = false;
   bool association = false;
   ProviderLibrary* library = nullptr;
@@ -48,14 +49,27 @@ class Routes {
   /// Those of the class and of every class below it, superclasses first.
   [[nodiscard]] std::vector<const Route*> below(std::string_view nameSpace, const ClassInfo& top) const;
 
-  /// The provider that answers for instances of this class: its own, or that of the nearest ancestor that has
-  /// one. nullptr: none.
-  [[nodiscard]] const Route* responsible(std::string_view nameSpace, const ClassInfo& info) const;
+  /// Those of the concrete classes that are registered for associations: of the class and of every class
+  /// below it, or all of them where none is given; in the order in which the schema declares them.
+  [[nodiscard]] std::vector<const Route*> associations(std::string_view nameSpace,
+                                                       const ClassInfo* top) const;
+
+  /// The provider that answers an operation (`Route::instance` or `Route::association`) for instances of this
+  /// class: its own, or that of the nearest ancestor that has one. nullptr: none.
+  [[nodiscard]] const Route* responsible(std::string_view nameSpace, const ClassInfo& info,
+                                         bool Route::*operation) const;
+
+  [[nodiscard]] const ClassTable& classes() const { return classes_; }
+  [[nodiscard]] const ClassRepository& schema() const { return schema_; }
 
  private:
-  using ByClass = std::unordered_map<const ClassInfo*, Route>;
+  struct NameSpace {
+    std::unordered_map<const ClassInfo*, Route> byClass;
+    std::vector<const Route*> associations;  ///< of concrete classes, in the order of declaration
+  };
 
-  [[nodiscard]] const ByClass* inNameSpace(std::string_view nameSpace) const;
+  [[nodiscard]] const NameSpace* inNameSpace(std::string_view nameSpace) const;
+  void listAssociations();
   ProviderLibrary& library(const ProviderRegistration& registration, const Broker& broker,
                            const std::filesystem::path& folder,
                            const std::function<void(std::string_view)>& log);
@@ -63,7 +77,7 @@ class Routes {
   const ClassRepository& schema_;
   const ClassTable& classes_;
   std::map<std::pair<std::string, std::string>, std::unique_ptr<ProviderLibrary>> libraries_;
-  std::vector<std::pair<std::string, ByClass>> nameSpaces_;  ///< few: in the order of registration
+  std::vector<std::pair<std::string, NameSpace>> nameSpaces_;  ///< few: in the order of registration
 };
 
 }  // namespace cimom

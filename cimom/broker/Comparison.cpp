@@ -2,6 +2,8 @@
 #include <cimom/broker/Values.h>
 
 #include <algorithm>
+#include <functional>
+#include <string_view>
 
 namespace cimom {
 
@@ -48,6 +50,26 @@ bool sameContent(const CMPIData& left, const CMPIData& right) {
   }
 }
 
+// For values that are the same in a key, the same; for others of the rarer types, too.
+std::size_t keyHash(const CMPIData& data) {
+  if (isNull(data)) {
+    return 0;
+  }
+  if (const auto number = integer(data); number) {
+    return std::hash<std::uint64_t>()(number->bits);
+  }
+  switch (data.type) {
+    case CMPI_string:
+      return std::hash<std::string_view>()(*text(data));
+    case CMPI_dateTime:
+      return std::hash<std::string_view>()(*dateTimeText(data));
+    case CMPI_ref:
+      return pathHash(*objectPath(data));
+    default:
+      return data.type;
+  }
+}
+
 }  // namespace
 
 bool sameValue(const CMPIData& left, const CMPIData& right) {
@@ -69,6 +91,16 @@ bool samePath(const ObjectPath& left, const ObjectPath& right) {
   const auto all = left.keys();
   return sameName(left.className(), right.className()) && all.size() == right.keys().size() &&
          std::all_of(all.begin(), all.end(), isIn);
+}
+
+std::size_t pathHash(const ObjectPath& path) {
+  // The odd factor ties a value to its name; the sum does not know the order of the keys.
+  constexpr std::size_t factor = 0x9e3779b97f4a7c15U;
+  std::size_t hash = NameHash()(path.className());
+  for (const NamedValue& key : path.keys()) {
+    hash += (NameHash()(key.name) ^ keyHash(key.data)) * factor;
+  }
+  return hash;
 }
 
 }  // namespace cimom

@@ -184,6 +184,8 @@ class ObjectPath final : public CMPIObjectPath {
 /// Same class and same keys, in any order; namespaces and host names do not count. Integer keys compare by
 /// value whatever their type, because clients cannot write the type.
 [[nodiscard]] bool samePath(const ObjectPath& left, const ObjectPath& right);
+/// The same for paths that are `samePath`.
+[[nodiscard]] std::size_t pathHash(const ObjectPath& path);
 
 class Instance final : public CMPIInstance {
  public:

@@ -1,6 +1,6 @@
 #include "Asked.h"
 
-#include <cimom/Dispatcher.h>
+#include <cimom/ProviderCall.h>
 
 namespace {
 
@@ -23,7 +23,7 @@ TEST_F(Upcalls, reachOtherProvidersWithTheirKeys) {
 TEST_F(Upcalls, areBoundedInDepth) {
   const Answer answer = instances("TEST_Deep");
   EXPECT_EQ(answer.outcome.status.code, CMPI_RC_OK);
-  const auto deepest = static_cast<std::size_t>(cimom::Dispatcher::deepestNesting - 1);
+  const auto deepest = static_cast<std::size_t>(cimom::Nesting::deepest - 1);
   EXPECT_THAT(answer.objects,
               ElementsAre("TEST_Deep " + std::string(deepest, 'x') + " " + std::to_string(deepest),
                           "TEST_Deep providers ask each other more than 16 calls deep 1000"));
