@@ -4,6 +4,7 @@
 #include <agent/discovery/drivers/DriverSource.h>
 #include <agent/discovery/host/HostSource.h>
 #include <agent/discovery/network/NetworkSource.h>
+#include <agent/framework/OwnNumbers.h>
 
 #include <Oru/NodeLexicon.h>
 
@@ -58,6 +59,9 @@ NodeTree discover(const DiscoveryOptions& options) {
   const NodeTreeBuilder::Handle computer = builder.add(
       NodeTreeBuilder::noParent, Oru::NodeLexicon::ComputerSystemNode, computerPosition, "Computer System");
   builder.setNumber(computer, computerNumber);
+  if (root.isLive()) {  // the computer that this runs on; of another root nobody knows
+    builder.setText(computer, StateProperty, "up");
+  }
   for (const SourceResult& result : results) {
     if (result.computerName) {
       builder.setText(computer, Oru::NodeLexicon::NameProperty, *result.computerName);

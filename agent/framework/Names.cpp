@@ -26,7 +26,7 @@ constexpr std::array<Name, 8> nodeTypes{{
     {DeviceNode, "Device"},
 }};
 
-constexpr std::array<Name, 11> properties{{
+constexpr std::array<Name, 15> properties{{
     {Oru::NodeLexicon::ManufacturerProperty, "Manufacturer"},
     {Oru::NodeLexicon::MajorVersionProperty, "MajorVersion"},
     {Oru::NodeLexicon::MinorVersionProperty, "MinorVersion"},
@@ -38,6 +38,10 @@ constexpr std::array<Name, 11> properties{{
     {Oru::NodeLexicon::ElementSoftwareStatusProperty, "ElementSoftwareStatus"},
     {Oru::NodeLexicon::VersionStringProperty, "VersionString"},
     {DrivenDevicesProperty, "DrivenDevices"},
+    {PermanentAddressProperty, "PermanentAddress"},
+    {LinkTechnologyProperty, "LinkTechnology"},
+    {SpeedProperty, "Speed"},
+    {StateProperty, "State"},
 }};
 
 std::optional<std::string_view> nameIn(std::span<const Name> names, int number) {

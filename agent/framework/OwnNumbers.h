@@ -13,7 +13,11 @@ enum OwnNodeType : int {
 
 enum OwnProperty : int {
   DrivenDevicesProperty =
-      firstOwnNumber,  ///< of a driver: the devices it drives, "BUS:ADDRESS", ", " between two
+      firstOwnNumber,        ///< of a driver: the devices it drives, "BUS:ADDRESS", ", " between two
+  PermanentAddressProperty,  ///< of a port: the address its hardware came with, "02:00:5e:10:00:01"
+  LinkTechnologyProperty,  ///< of a port: "Ethernet" and the other words of CIM's LinkTechnology, or another
+  SpeedProperty,           ///< of a port: the speed of its link as it is now, in Mbit/s (a number)
+  StateProperty,           ///< of a computer or a port: "up", "down" (no link), "disabled" or "testing"
 };
 
 }  // namespace agent

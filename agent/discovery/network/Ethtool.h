@@ -1,4 +1,4 @@
-// The ethtool driver-info request, and what its answer says.
+// The ethtool requests that ask a driver about itself and its hardware, and what their answers say.
 #pragma once
 
 #include <memory>
@@ -14,7 +14,7 @@ class Ethtool {
  public:
   struct Answer {
     int error = 0;      ///< an errno value; 0: the driver answered
-    std::string bytes;  ///< the kernel's `struct ethtool_drvinfo`, as it came; for `parseDriverInfo`
+    std::string bytes;  ///< what came, where the driver answered
   };
 
   Ethtool() = default;
@@ -22,8 +22,13 @@ class Ethtool {
   Ethtool& operator=(const Ethtool&) = delete;
   virtual ~Ethtool() = default;
 
-  /// The driver info (`ETHTOOL_GDRVINFO`) of the interface with that name.
+  /// The driver info (`ETHTOOL_GDRVINFO`) of the interface with that name: the kernel's `struct
+  /// ethtool_drvinfo`, for `parseDriverInfo`.
   virtual Answer driverInfo(const std::string& interfaceName) = 0;
+
+  /// The address that the hardware of the interface came with (`ETHTOOL_GPERMADDR`), byte by byte; no bytes
+  /// where the driver knows none.
+  virtual Answer permanentAddress(const std::string& interfaceName) = 0;
 };
 
 /// The running kernel's: `ioctl(SIOCETHTOOL)` on a socket of its own. Needs no root.

@@ -87,6 +87,7 @@ NetworkInterface readInterface(SourceContext& context, const std::string& name) 
   interface.physicalName = context.textIfAny(folder + "/phys_port_name");
   interface.hardwareAddress = context.textIfAny(folder + "/address");
   interface.index = numberIfAny(context, folder + "/ifindex", highestIndex).value_or(0);
+  interface.facts = readPortFacts(context, name);
   return interface;
 }
 

@@ -3,6 +3,7 @@
 #pragma once
 
 #include <agent/discovery/Source.h>
+#include <agent/discovery/network/PortFacts.h>
 
 #include <cstdint>
 #include <map>
@@ -22,6 +23,7 @@ struct NetworkInterface {
   /// sys/class/net/NAME/address: "02:00:5e:10:00:01".
   std::optional<std::string> hardwareAddress;
   std::uint32_t index = 0;  ///< the kernel's number of the interface, in the order of making
+  PortFacts facts;
 };
 
 /// By the bus address of the device: "0000:3b:00.0" on PCI, "BUS:ADDRESS" elsewhere, such as "usb:1-1.4:1.0".

@@ -1,5 +1,6 @@
 #include <agent/discovery/network/Interfaces.h>
 #include <agent/discovery/network/NetworkSource.h>
+#include <agent/framework/OwnNumbers.h>
 
 #include <Oru/NodeLexicon.h>
 
@@ -43,6 +44,26 @@ void fill(std::optional<std::string>& known, const std::optional<std::string>& t
   }
 }
 
+/// Asks for the permanent addresses that the interfaces' attributes do not tell: of the members of a bond,
+/// for example, which all bear the bond's address.
+void askAddresses(SourceContext& context, Ethtool& ethtool, InterfacesByDevice& devices) {
+  for (auto& [address, interfaces] : devices) {
+    for (NetworkInterface& interface : interfaces) {
+      if (interface.facts.permanentAddress) {
+        continue;
+      }
+      const std::string what = "ethtool permanent address of " + interface.name;
+      context.doing(what);
+      const Ethtool::Answer answer = ethtool.permanentAddress(interface.name);
+      if (answer.error == 0) {
+        interface.facts.permanentAddress = addressText(answer.bytes);
+      } else if (answer.error != EOPNOTSUPP) {
+        context.reportError(what, answer.error);
+      }
+    }
+  }
+}
+
 InfoByDevice askDrivers(SourceContext& context, Ethtool& ethtool, const InterfacesByDevice& devices) {
   InfoByDevice infos;
   for (const auto& [address, interfaces] : devices) {
@@ -71,6 +92,13 @@ FoundNode deviceNode(const std::string& address, std::vector<NetworkInterface> i
   for (std::size_t i = 0; i < interfaces.size(); ++i) {
     FoundNode port{NodeLexicon::NetworkPortNode, identifiers[i], interfaces[i].name, {}, {}, {}};
     port.setText(NodeLexicon::NameProperty, identifiers[i]);
+    const PortFacts& facts = interfaces[i].facts;
+    port.setText(PermanentAddressProperty, facts.permanentAddress);
+    port.setText(LinkTechnologyProperty, facts.linkTechnology);
+    port.setText(StateProperty, facts.state);
+    if (facts.speed) {
+      port.setValue(SpeedProperty, *facts.speed);
+    }
     device.children.push_back(std::move(port));
   }
   return device;
@@ -92,7 +120,7 @@ std::vector<FoundNode> nodesOf(const InterfacesByDevice& devices, const InfoByDe
 }  // namespace
 
 void readNetwork(SourceContext& context, const std::shared_ptr<Ethtool>& ethtool) {
-  const InterfacesByDevice devices = findInterfaces(context);
+  InterfacesByDevice devices = findInterfaces(context);
   context.result().nodes = nodesOf(devices, {});
   if (devices.empty()) {
     return;
@@ -103,7 +131,9 @@ void readNetwork(SourceContext& context, const std::shared_ptr<Ethtool>& ethtool
     return;
   }
   context.publish();  // a driver may hang
-  context.result().nodes = nodesOf(devices, askDrivers(context, *ethtool, devices));
+  const InfoByDevice infos = askDrivers(context, *ethtool, devices);
+  askAddresses(context, *ethtool, devices);
+  context.result().nodes = nodesOf(devices, infos);
 }
 
 }  // namespace agent::discovery

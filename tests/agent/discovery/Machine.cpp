@@ -83,6 +83,14 @@ Ethtool::Answer FakeEthtool::driverInfo(const std::string& interfaceName) {
   return {0, driverInfoBytes(told->second.version, told->second.firmware)};
 }
 
+Ethtool::Answer FakeEthtool::permanentAddress(const std::string& interfaceName) {
+  const auto told = told_.find(interfaceName);
+  if (told == told_.end() || told->second.address.empty()) {
+    return {EOPNOTSUPP, {}};
+  }
+  return {0, told->second.address};
+}
+
 std::string driverInfoBytes(std::string_view version, std::string_view firmware) {
   ethtool_drvinfo info{};
   std::memcpy(info.version, version.data(), std::min(version.size(), sizeof info.version));

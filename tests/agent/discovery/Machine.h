@@ -50,10 +50,12 @@ class FakeEthtool : public Ethtool {
     std::string version;
     std::string firmware;
     int error = 0;
+    std::string address = {};  ///< the permanent address's bytes; none: the driver does not tell
   };
 
   explicit FakeEthtool(std::map<std::string, Told> told) : told_(std::move(told)) {}
   Answer driverInfo(const std::string& interfaceName) override;
+  Answer permanentAddress(const std::string& interfaceName) override;
 
  private:
   std::map<std::string, Told> told_;

@@ -55,6 +55,10 @@ class HangingEthtool : public Ethtool {
     door_->pass();
     return {0, driverInfoBytes("late", "late")};
   }
+  Answer permanentAddress(const std::string& /*interfaceName*/) override {
+    door_->pass();
+    return {0, "late"};
+  }
 
  private:
   std::shared_ptr<Door> door_;
