@@ -39,8 +39,10 @@ Moniker firmwareOfComputer(Instrumentation& tree, const FirmwareKind& kind, Moni
   if (nameOfComputer(tree) != *wanted) {
     throw InstrumentationException(kind.otherComputer);
   }
+  const std::string parentText = tree.convertPathToString(parent);
+  const std::string firmwareText = tree.convertPathToString(firmware);
   std::string instanceId;
-  InstanceIdMaker().make(tree.convertPathToString(parent), tree.convertPathToString(firmware), instanceId);
+  InstanceIdMaker().make(parentText, firmwareText, instanceId);
   traceVariable(point, "InstanceID", instanceId);
   return monikerOf(instanceIdKey, instanceId);
 }
