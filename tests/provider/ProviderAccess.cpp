@@ -31,10 +31,11 @@ std::vector<standin::Node> sampleNodes() {
   };
 }
 
-ProviderTest::ProviderTest() : world(*providerAccess().world) {
+ProviderTest::ProviderTest() : world(*providerAccess().world), broker{} {
   world.~World();
   new (&world) standin::World;
   world.nodes = sampleNodes();
+  broker = world.newBroker();
   CMPIStatus status{CMPI_RC_ERROR, nullptr};
   instances = providerAccess().createInstanceMI(&broker, nullptr, &status);
   associations = providerAccess().createAssociationMI(&broker, nullptr, &status);

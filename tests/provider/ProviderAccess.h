@@ -54,7 +54,7 @@ class ProviderTest : public testing::Test {
   std::size_t countCalls(const std::string& call) const;
 
   standin::World& world;
-  CMPIBroker broker{};
+  CMPIBroker broker;
   CMPIInstanceMI* instances = nullptr;
   CMPIAssociationMI* associations = nullptr;
 };

@@ -24,7 +24,8 @@ std::string pathOf(const std::string& text) {
 }
 
 struct Cursor {
-  std::vector<const Node*> walk;
+  std::vector<const Node*> selected;
+  std::vector<const Node*> walk;  ///< those of the selected nodes that pass the filter
   std::size_t at = 0;
 
   [[nodiscard]] const Node* node() const { return at < walk.size() ? walk[at] : nullptr; }
@@ -59,9 +60,10 @@ void Instrumentation::selectNode(NodeLexicon::NodeType type) {
   const bool fails = world().record("selectNode(" + std::to_string(type) + ")", true);
   for (const Node& node : world().nodes) {
     if (node.type == type && !fails) {
-      self.walk.push_back(&node);
+      self.selected.push_back(&node);
     }
   }
+  self.walk = self.selected;
   if (self.walk.empty() && !fails && world().missingTypeThrows) {
     throw InstrumentationException("no node of that type");
   }
@@ -74,23 +76,24 @@ void Instrumentation::selectNode(const std::string& path) {
     return;
   }
   if (const Node* node = path.empty() ? nullptr : world().find(path.substr(1))) {
-    self.walk.push_back(node);
+    self.selected.push_back(node);
   }
+  self.walk = self.selected;
 }
 
 void Instrumentation::setFilter(NodeLexicon::PathType type, const std::string& path) {
   Cursor& self = cursor(state_);
-  const std::vector<const Node*> before = std::exchange(self.walk, {});
+  self.walk.clear();
   self.at = 0;
   if (world().record("setFilter(" + std::to_string(type) + "," + quoted(path) + ")", true)) {
     return;
   }
-  for (const Node* node : before) {
+  for (const Node* node : self.selected) {
     if (type == NodeLexicon::ExactPath ? pathOf(node->text) == path : isBelow(*node, path)) {
       self.walk.push_back(node);
     }
   }
-  if (self.walk.empty()) {
+  if (self.walk.empty() && world().emptyFilterThrows) {
     throw InstrumentationException("nothing passes the filter");
   }
 }
@@ -140,7 +143,8 @@ std::string Instrumentation::getNodeDescription() {
 
 int Instrumentation::getSensorType() {
   const Node* node = cursor(state_).node();
-  return world().record("getSensorType", true) || node == nullptr ? -1 : node->type;
+  return world().record("getSensorType", true) || node == nullptr ? -1
+                                                                  : node->sensorType.value_or(node->type);
 }
 
 bool Instrumentation::getProperty(NodeLexicon::Properties property, std::string& value) {

@@ -22,6 +22,14 @@ std::string callOf(const char* operation, const char* name) {
   return std::string(operation) + "(" + (name != nullptr ? name : "null") + ")";
 }
 
+std::string callOf(const char* operation, const char* name, const char* argument) {
+  return std::string(operation) + "(" + name + "," + argument + ")";
+}
+
+std::string describe(CMPIObjectPath* path) {
+  return standin::describe(unwrap(path));
+}
+
 void set(CMPIInstance* instance, const char* name, std::string value) {
   if (!world().record(callOf("setProperty", name), false) && instance != nullptr) {
     static_cast<standin::Instance*>(instance->hdl)->properties.emplace_back(name, std::move(value));
@@ -83,7 +91,9 @@ std::string ProviderUtilities::getNamespace(const CMPIObjectPath* path) {
 
 unsigned short ProviderUtilities::getKeyCount(const CMPIObjectPath* path) {
   const bool fails = world().record("getKeyCount", false);
-  return fails || path == nullptr ? 0 : static_cast<unsigned short>(unwrap(path)->keys.size());
+  return fails || path == nullptr
+             ? 0
+             : static_cast<unsigned short>(unwrap(path)->keys.size() + unwrap(path)->references.size());
 }
 
 bool ProviderUtilities::getKeyProperty(const CMPIObjectPath* path, const char* name, std::string& value) {
@@ -99,8 +109,16 @@ bool ProviderUtilities::getKeyProperty(const CMPIObjectPath* path, const char* n
   return false;
 }
 
-bool ProviderUtilities::getKeyProperty(const CMPIObjectPath*, const char* name, CMPIObjectPath**) {
-  world().record(callOf("getKeyProperty", name), false);
+bool ProviderUtilities::getKeyProperty(const CMPIObjectPath* path, const char* name, CMPIObjectPath** value) {
+  if (world().record(callOf("getKeyProperty", name, "reference"), false) || path == nullptr) {
+    return false;
+  }
+  for (const auto& [key, reference] : unwrap(path)->references) {
+    if (key == name && reference != nullptr) {
+      *value = &reference->cmpi;
+      return true;
+    }
+  }
   return false;
 }
 
@@ -110,8 +128,10 @@ void ProviderUtilities::setKeyProperty(CMPIObjectPath* path, const char* name, c
   }
 }
 
-void ProviderUtilities::setKeyProperty(CMPIObjectPath*, const char* name, CMPIObjectPath*) {
-  world().record(callOf("setKeyProperty", name), false);
+void ProviderUtilities::setKeyProperty(CMPIObjectPath* path, const char* name, CMPIObjectPath* value) {
+  if (!world().record(callOf("setKeyProperty", name, describe(value).c_str()), false) && path != nullptr) {
+    unwrap(path)->references.emplace_back(name, unwrap(value));
+  }
 }
 
 CMPIObjectPath* ProviderUtilities::createObjectPath(const CMPIBroker* broker, const char* className,
@@ -127,8 +147,18 @@ CMPIInstance* ProviderUtilities::createInstance(const CMPIBroker* broker, CMPIOb
   return fails || path == nullptr ? nullptr : &world().newInstance(unwrap(path))->cmpi;
 }
 
-bool ProviderUtilities::getProperty(const CMPIInstance*, const char* name, std::string&, bool) {
-  world().record(callOf("getProperty", name), false);
+bool ProviderUtilities::getProperty(const CMPIInstance* instance, const char* name, std::string& value,
+                                    bool flag) {
+  const bool fails = world().record(callOf("getProperty", name, flag ? "true" : "false"), false);
+  if (fails || instance == nullptr || instance->hdl == nullptr) {
+    return false;
+  }
+  for (const auto& [property, its] : static_cast<standin::Instance*>(instance->hdl)->properties) {
+    if (property == name) {
+      value = its;
+      return true;
+    }
+  }
   return false;
 }
 
@@ -141,8 +171,8 @@ void ProviderUtilities::setProperty(CMPIInstance* instance, const char* name, un
 void ProviderUtilities::setProperty(CMPIInstance* instance, const char* name, bool value) {
   set(instance, name, value ? "true" : "false");
 }
-void ProviderUtilities::setProperty(CMPIInstance* instance, const char* name, CMPIObjectPath*) {
-  set(instance, name, "reference");
+void ProviderUtilities::setProperty(CMPIInstance* instance, const char* name, CMPIObjectPath* value) {
+  set(instance, name, describe(value));
 }
 void ProviderUtilities::setProperty(const CMPIBroker* broker, CMPIInstance* instance, const char* name,
                                     std::string& value, bool isDateTime) {
@@ -160,13 +190,23 @@ void ProviderUtilities::setProperty(const CMPIBroker* broker, CMPIInstance* inst
   set(instance, name, listOf(values));
 }
 void ProviderUtilities::transformObjectPathToMoniker(const CMPIObjectPath* path, Moniker& moniker) {
-  world().record("transformObjectPathToMoniker", false);
+  if (world().record("transformObjectPathToMoniker", false) || path == nullptr) {
+    return;
+  }
   for (const auto& [name, value] : unwrap(path)->keys) {
     moniker.addKey(name, value);
   }
 }
-void ProviderUtilities::transformMonikerToObjectPath(Moniker&, CMPIObjectPath**) {
-  world().record("transformMonikerToObjectPath", false);
+void ProviderUtilities::transformMonikerToObjectPath(Moniker& moniker, CMPIObjectPath** path) {
+  if (world().record("transformMonikerToObjectPath", false) || *path == nullptr) {
+    return;
+  }
+  for (unsigned int i = 0; i < moniker.getKeyCount(); ++i) {
+    auto& [name, value] = unwrap(*path)->keys.emplace_back();
+    if (!moniker.selectKey(i) || !moniker.getName(name) || !moniker.getValue(value)) {
+      unwrap(*path)->keys.pop_back();
+    }
+  }
 }
 
 }  // namespace Oru

@@ -11,6 +11,7 @@
 #include <functional>
 #include <map>
 #include <memory>
+#include <optional>
 #include <string>
 #include <utility>
 #include <vector>
@@ -25,6 +26,7 @@ struct Node {
   std::string description;
   std::map<int, std::string> texts;
   std::map<int, unsigned int> numbers;
+  std::optional<int> sensorType = std::nullopt;  ///< where it is not the type
 };
 
 struct LogLine {
@@ -43,18 +45,42 @@ struct Path {
   std::string className;
   std::string nameSpace;
   std::vector<std::pair<std::string, std::string>> keys;
+  std::vector<std::pair<std::string, Path*>> references;  ///< reference keys; a null one was set to null
 };
+
+/// A path as a text, "Class.Key=value,Reference={...}" without its namespace; "(null)" for null.
+std::string describe(const Path* path);
 
 struct Instance {
   CMPIInstance cmpi{};
   Path* path = nullptr;
-  /// In the order in which they were set; arrays as "[1,2]", datetimes as "datetime:" and the text.
+  /// In the order in which they were set; arrays as "[1,2]", datetimes as "datetime:" and the text,
+  /// references as their paths are described.
   std::vector<std::pair<std::string, std::string>> properties;
 };
 
+/// How the broker answers the enumeration of a class that another provider serves.
+struct Served {
+  CMPIrc status = CMPI_RC_OK;
+  bool enumerationIsNull = false;
+  std::vector<Instance*> instances;
+  bool narrows = true;                        ///< leaves out what differs from the keys of the path
+  std::size_t failingElement = 0;             ///< getNext of the element with this number (from 1) fails
+  std::vector<CMPIBoolean> hasNextAnswers{};  ///< given first, in this order; then 1 or 0, as it is
+};
+
+/// An enumeration of instances that was asked of the broker.
+struct Upcall {
+  const CMPIBroker* broker = nullptr;
+  const CMPIContext* context = nullptr;
+  const Path* path = nullptr;
+  const char** properties = nullptr;
+};
+
 /// How the call that was picked fails: with its own bad result (false, null, empty, a cursor on no node, a
-/// status other than OK), or by throwing Oru::InstrumentationException (cursor calls alone).
-enum class Fault { Result, Throw };
+/// status other than OK), or, cursor calls alone, by throwing Oru::InstrumentationException, another
+/// exception, or what is no exception at all.
+enum class Fault { Result, Throw, ThrowOther, ThrowNumber };
 
 struct World {
   World();
@@ -62,7 +88,9 @@ struct World {
 
   // What there is.
   std::vector<Node> nodes;
-  bool missingTypeThrows = true;  ///< selectNode of a type without nodes throws, or stands on no node
+  bool missingTypeThrows = true;         ///< selectNode of a type without nodes throws, or stands on no node
+  bool emptyFilterThrows = true;         ///< setFilter that nothing passes throws, or stands on no node
+  std::map<std::string, Served> served;  ///< by class; the broker does not know any other
   std::map<std::string, unsigned short> classIds;
   std::map<std::string, std::vector<std::string>> ancestors;  ///< of classes the framework has no id for
   CMPIrc classNameStatus = CMPI_RC_OK;
@@ -77,6 +105,7 @@ struct World {
   std::vector<Instance*> returnedInstances;  ///< null where null was returned
   int done = 0;
   std::vector<const CMPIBroker*> brokersUsed;
+  std::vector<Upcall> upcalls;
   std::vector<unsigned int> written;  ///< by the last setProperty
 
   // Faults: the call with this number (from 1) fails. 0: none does.
@@ -96,13 +125,28 @@ struct World {
   // Objects for requests; they live as long as the world.
   Path* newPath(std::string className, std::string nameSpace = "root/cimv2");
   Instance* newInstance(Path* path);
+  /// An instance of another provider: its keys are its properties, too.
+  Instance* newInstance(std::string className, std::vector<std::pair<std::string, std::string>> keys);
   CMPIResult* result();
+  /// A broker of that name, whose enumerations `served` answers.
+  CMPIBroker newBroker(const char* name = "recording stand-in");
+  CMPIEnumeration* newEnumeration(const Served& answer, const Path& path);
 
   const Node* find(const std::string& text) const;
+
+  /// Behind a CMPIEnumeration.
+  struct Enumeration {
+    CMPIEnumeration cmpi{};
+    Served answer;
+    std::size_t next = 0;
+    std::size_t hasNextCalls = 0;
+  };
 
  private:
   std::vector<std::unique_ptr<Path>> paths_;
   std::vector<std::unique_ptr<Instance>> instances_;
+  std::vector<std::unique_ptr<Enumeration>> enumerations_;
+  std::vector<std::unique_ptr<CMPIBrokerFT>> brokerTables_;
   CMPIResult result_{};
 };
 

@@ -1,5 +1,7 @@
 #include <Oru/Exceptions.h>
 
+#include <stdexcept>
+
 #include "StandIn.h"
 
 namespace standin {
@@ -70,6 +72,18 @@ CMPIObjectPathFT makePathTable() {
   return table;
 }
 
+[[noreturn]] void throwFault(Fault fault) {
+  constexpr int number = 17;
+  switch (fault) {
+    case Fault::ThrowOther:
+      throw std::runtime_error("another failure");
+    case Fault::ThrowNumber:
+      throw number;  // NOLINT(hicpp-exception-baseclass): what the provider cannot know
+    default:
+      throw Oru::InstrumentationException("injected failure");
+  }
+}
+
 CMPIResultFT resultTable = makeResultTable();
 CMPIObjectPathFT pathTable = makePathTable();
 
@@ -83,7 +97,9 @@ World::World() {
               {"KELVO_NetworkSoftwareIdentity", 35},
               {"KELVO_BMCSoftwareIdentity", 117},
               {"KELVO_BIOSSoftwareIdentity", 118},
-              {"KELVO_ComputerSystem", 1}};
+              {"KELVO_ComputerSystem", 1},
+              {"KELVO_NetworkPort", 17},
+              {"KELVO_SPComputerSystem", 119}};
   result_.hdl = this;
   result_.ft = &resultTable;
 }
@@ -97,15 +113,15 @@ bool World::record(std::string call, bool mayThrow, bool hasBadResult) {
   }
   faultReached = true;
   faultCall = calls.back();
-  if (fault == Fault::Throw) {
-    if (mayThrow) {
-      faultApplied = true;
-      throw Oru::InstrumentationException("injected failure");
-    }
-    return false;
+  if (fault == Fault::Result) {
+    faultApplied = hasBadResult;
+    return hasBadResult;
   }
-  faultApplied = hasBadResult;
-  return hasBadResult;
+  faultApplied = mayThrow;
+  if (mayThrow) {
+    throwFault(fault);
+  }
+  return false;
 }
 
 void World::forget() {
@@ -114,6 +130,7 @@ void World::forget() {
   returnedPaths.clear();
   returnedInstances.clear();
   brokersUsed.clear();
+  upcalls.clear();
   written.clear();
   done = 0;
   failAt = 0;
@@ -128,13 +145,6 @@ Path* World::newPath(std::string className, std::string nameSpace) {
   path->nameSpace = std::move(nameSpace);
   path->cmpi = {path.get(), &pathTable};
   return path.get();
-}
-
-Instance* World::newInstance(Path* path) {
-  auto& instance = instances_.emplace_back(std::make_unique<Instance>());
-  instance->path = path;
-  instance->cmpi = {instance.get(), nullptr};
-  return instance.get();
 }
 
 CMPIResult* World::result() {
