@@ -1,5 +1,6 @@
 #include <cimom/Names.h>
 #include <cimom/broker/WbemUri.h>
+#include <cli/BriefPath.h>
 #include <cli/CimRows.h>
 #include <cli/CimStatus.h>
 #include <cli/Messages.h>
@@ -13,6 +14,9 @@
 
 namespace cli {
 namespace {
+
+/// No property can be called so.
+constexpr std::string_view pathColumnName = "@path";
 
 /// A table's properties of a software identity, with the order in which a narrow terminal loses them.
 constexpr std::array<std::pair<const char*, int>, 6> tellingProperties{{{"InstanceID", 0},
@@ -55,8 +59,8 @@ std::map<std::uint64_t, std::string> valueNames(const cimom::mof::Property& prop
 
 Column columnOf(const cimom::mof::Property& property) {
   const CMPIType type = property.type;
-  return {property.name, valueNames(property), type == CMPI_dateTime || (property.key && type == CMPI_string),
-          0};
+  const bool whole = type == CMPI_dateTime || type == CMPI_ref || (property.key && type == CMPI_string);
+  return {property.name, valueNames(property), whole, 0};
 }
 
 std::string utf8(CMPIChar16 unit) {
@@ -75,6 +79,10 @@ std::string utf8(CMPIChar16 unit) {
   return text;
 }
 
+Reference referenceTo(const cimom::ObjectPath& path) {
+  return {cimom::formatWbemUri(path), briefPath(path)};
+}
+
 /// Objects by their text, all else null.
 Scalar objectScalar(const CMPIData& data) {
   if (const auto text = cimom::text(data)) {
@@ -84,10 +92,10 @@ Scalar objectScalar(const CMPIData& data) {
     return DateTime{std::string(*text)};
   }
   if (const cimom::ObjectPath* path = cimom::objectPath(data)) {
-    return Reference{cimom::formatWbemUri(*path)};
+    return referenceTo(*path);
   }
   if (const cimom::Instance* instance = cimom::instance(data)) {
-    return Reference{cimom::formatWbemUri(instance->path())};
+    return referenceTo(instance->path());
   }
   return std::monostate{};
 }
@@ -137,24 +145,53 @@ Value valueOf(const CMPIData& data) {
   return values;
 }
 
-[[noreturn]] void noSuchProperty(const cimom::SchemaClass& info, const std::string& name) {
+[[noreturn]] void noSuchProperty(const std::vector<const cimom::SchemaClass*>& classes,
+                                 const std::string& name) {
   std::vector<std::string> known;
-  std::string list;
-  for (const auto& property : info.properties) {
-    list.append(list.empty() ? "" : ", ").append(property.name);
-    known.push_back(property.name);
+  std::string names;
+  std::string classNames;
+  for (const cimom::SchemaClass* info : classes) {
+    classNames.append(classNames.empty() ? "" : ", ").append(info->name());
+    for (const auto& property : info->properties) {
+      names.append(names.empty() ? "" : ", ").append(property.name);
+      known.push_back(property.name);
+    }
   }
   const auto nearest = nearestName(name, known);
-  throw CommandError(statusName(CMPI_RC_ERR_NO_SUCH_PROPERTY) + ": " + info.name() + " has no property '" +
-                     name + "'" + (nearest ? "; did you mean " + *nearest + "?" : "; it has " + list));
+  std::string message = statusName(CMPI_RC_ERR_NO_SUCH_PROPERTY) + ": ";
+  message += classes.size() == 1 ? classNames + " has no property '" + name + "'"
+                                 : "none of " + classNames + " has a property '" + name + "'";
+  if (nearest) {
+    message += "; did you mean " + *nearest + "?";
+  } else if (classes.size() == 1) {
+    message += "; it has " + names;
+  }
+  throw CommandError(message);
 }
 
-/// Members of JSON objects keep the order of the MOF, whatever was asked for first.
-Columns inOrderOf(const cimom::SchemaClass& info, Columns columns) {
-  std::stable_sort(columns.begin(), columns.end(), [&info](const Column& left, const Column& right) {
-    return info.property(left.name) < info.property(right.name);
-  });
-  return columns;
+/// Where a table has a property: what tells an instance from others before the rest, and at the end the
+/// system, which is the same one on most machines.
+int tellingRank(const cimom::SchemaClass& info, const Column& column) {
+  if (namesASystem(column.name)) {
+    return 2;
+  }
+  return info.property(column.name)->key ? 0 : 1;
+}
+
+/// `object` has the values: an instance or a path.
+template <typename Object>
+Row rowFrom(const Object& object, const cimom::ObjectPath& path, const Columns& columns) {
+  Row row;
+  row.reserve(columns.size());
+  for (const Column& column : columns) {
+    if (column.name == pathColumnName) {
+      row.emplace_back(Scalar(referenceTo(path)));
+    } else {
+      const cimom::NamedValue* value = object.find(column.name);
+      row.push_back(value == nullptr ? Value() : valueOf(value->data));
+    }
+  }
+  return row;
 }
 
 }  // namespace
@@ -167,20 +204,30 @@ Columns allColumns(const cimom::SchemaClass& info) {
   return columns;
 }
 
-Columns namedColumns(const cimom::SchemaClass& info, const std::vector<std::string>& names) {
+Columns namedColumns(const std::vector<const cimom::SchemaClass*>& classes,
+                     const std::vector<std::string>& names) {
   Columns columns;
   for (const std::string& name : names) {
-    const cimom::mof::Property* property = info.property(name);
-    if (property == nullptr) {
-      noSuchProperty(info, name);
+    const auto has = [&name](const cimom::SchemaClass* info) { return info->property(name) != nullptr; };
+    const auto info = std::find_if(classes.begin(), classes.end(), has);
+    if (info == classes.end()) {
+      noSuchProperty(classes, name);
     }
-    const bool known = std::any_of(columns.begin(), columns.end(), [property](const Column& column) {
-      return column.name == property->name;
-    });
+    Column column = columnOf(*(*info)->property(name));
+    const bool known = std::any_of(columns.begin(), columns.end(),
+                                   [&column](const Column& other) { return other.name == column.name; });
     if (!known) {
-      columns.push_back(columnOf(*property));
+      columns.push_back(std::move(column));
     }
   }
+  return columns;
+}
+
+Columns columnsIn(const cimom::SchemaClass& info, Columns columns) {
+  std::erase_if(columns, [&info](const Column& column) { return info.property(column.name) == nullptr; });
+  std::stable_sort(columns.begin(), columns.end(), [&info](const Column& left, const Column& right) {
+    return info.property(left.name) < info.property(right.name);
+  });
   return columns;
 }
 
@@ -196,22 +243,32 @@ Columns tellingColumns(const cimom::SchemaClass& info) {
     return columns;
   }
   columns = allColumns(info);
-  std::stable_partition(columns.begin(), columns.end(),
-                        [&info](const Column& column) { return info.property(column.name)->key; });
+  std::erase_if(columns, [](const Column& column) { return namesAClass(column.name); });
+  std::stable_sort(columns.begin(), columns.end(), [&info](const Column& left, const Column& right) {
+    return tellingRank(info, left) < tellingRank(info, right);
+  });
+  int dropRank = 0;
+  for (Column& column : columns) {
+    column.dropRank = info.property(column.name)->key && !namesASystem(column.name) ? 0 : ++dropRank;
+  }
   return columns;
 }
 
 Columns chosenColumns(const cimom::SchemaClass& info, const Options& options) {
   if (!options.properties.empty()) {
-    Columns named = namedColumns(info, options.properties);
-    return options.format == Format::Json ? inOrderOf(info, named) : named;
+    Columns named = namedColumns({&info}, options.properties);
+    return options.format == Format::Json ? columnsIn(info, std::move(named)) : named;
   }
   const bool brief = options.format == Format::Table && options.command == Command::List;
   return brief ? tellingColumns(info) : allColumns(info);
 }
 
+Column pathColumn() {
+  return {std::string(pathColumnName), {}, true, 0};
+}
+
 Columns nameColumns(const cimom::SchemaClass& info) {
-  Columns columns{{"@path"}};
+  Columns columns{pathColumn()};
   for (const cimom::mof::Property* key : info.keys()) {
     columns.push_back(columnOf(*key));
   }
@@ -231,22 +288,11 @@ std::optional<std::vector<std::string>> wantedProperties(const cimom::SchemaClas
 }
 
 Row rowOf(const cimom::Instance& instance, const Columns& columns) {
-  Row row;
-  row.reserve(columns.size());
-  for (const Column& column : columns) {
-    const cimom::NamedValue* property = instance.find(column.name);
-    row.push_back(property == nullptr ? Value() : valueOf(property->data));
-  }
-  return row;
+  return rowFrom(instance, instance.path(), columns);
 }
 
 Row rowOf(const cimom::ObjectPath& path, const Columns& columns) {
-  Row row{Scalar(Reference{cimom::formatWbemUri(path)})};
-  for (std::size_t i = 1; i < columns.size(); ++i) {
-    const cimom::NamedValue* key = path.find(columns[i].name);
-    row.push_back(key == nullptr ? Value() : valueOf(key->data));
-  }
-  return row;
+  return rowFrom(path, path, columns);
 }
 
 }  // namespace cli

@@ -16,14 +16,22 @@ namespace cli {
 Columns allColumns(const cimom::SchemaClass& info);
 
 /// The named properties, each once, in the order given. Throws `CommandError` (CIM_ERR_NO_SUCH_PROPERTY) for
-/// a name that the class lacks.
-Columns namedColumns(const cimom::SchemaClass& info, const std::vector<std::string>& names);
+/// a name that all of the classes lack.
+Columns namedColumns(const std::vector<const cimom::SchemaClass*>& classes,
+                     const std::vector<std::string>& names);
+
+/// Those of the columns whose properties the class has, in the order of its MOF, in which members of JSON
+/// objects stand whatever was asked for first.
+Columns columnsIn(const cimom::SchemaClass& info, Columns columns);
 
 /// What a table shows unless told otherwise: of a software identity what tells it apart, of any other class
-/// its keys first, then the rest.
+/// its keys first, without those that repeat the names of classes, then the rest.
 Columns tellingColumns(const cimom::SchemaClass& info);
 
-/// The path, under a name that no property can have, then the keys.
+/// The object's path, under a name that no property can have: "@path".
+Column pathColumn();
+
+/// The path, then the keys.
 Columns nameColumns(const cimom::SchemaClass& info);
 
 /// The columns that the options ask for, or those that suit their format.
@@ -36,7 +44,7 @@ std::optional<std::vector<std::string>> wantedProperties(const cimom::SchemaClas
 /// Properties that were not set, or set to null, are null.
 Row rowOf(const cimom::Instance& instance, const Columns& columns);
 
-/// For the columns of `nameColumns`.
+/// Of a path: itself and its keys.
 Row rowOf(const cimom::ObjectPath& path, const Columns& columns);
 
 }  // namespace cli

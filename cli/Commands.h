@@ -10,6 +10,7 @@ namespace cli {
 void runList(const Options& options, Output& output);
 void runNames(const Options& options, Output& output);
 void runGet(const Options& options, Output& output);
+void runAssociators(const Options& options, Output& output);
 void runTree(const Options& options, Output& output);
 void runCapture(const Options& options, Output& output);
 

@@ -12,13 +12,19 @@ Commands:
   list [CLASS]     show the instances of a class (KELVO_SoftwareIdentity)
   names [CLASS]    show the object paths of all instances
   get OBJECT       show one instance, named by its InstanceID or its object path
+  associators OBJECT
+                   show what belongs to a computer, a port, a firmware
   tree             show the tree of devices that the inventory is made of
   capture FILE     save that tree as an inventory file
 
 Options:
   --format table|json|csv  how to print (default: table; tree has no csv)
-  --property NAME[,...]    list, get: these properties, in this order;
-                           repeatable
+  --property NAME[,...]    list, get, associators: these properties, in this
+                           order; repeatable
+  --names                  associators: object paths, one a line
+  --assoc-class CLASS, --result-class CLASS, --role ROLE, --result-role ROLE
+                           associators: only along this association, objects
+                           of this class, from and to these ends
   --inventory FILE         show the machine that an inventory file describes
   --system-root DIR        show the machine whose sys/, proc/, lib/ are in DIR
   --provider FILE          load this provider library, not the installed one
@@ -39,6 +45,7 @@ Examples:
   swinv list --format json | jq -r '.[].VersionString'
   swinv list --property InstanceID,VersionString --format csv > versions.csv
   swinv get 1@3b2                        one element with all its properties
+  swinv associators 1@3b2                the computer and the port it belongs to
   swinv capture server.json              save this machine ...
   swinv list --inventory server.json     ... and show it elsewhere
 
@@ -51,7 +58,18 @@ constexpr std::string_view listHelp =
 Usage: swinv list [CLASS] [OPTIONS]
 
 CLASS is a class of the schema; without it, KELVO_SoftwareIdentity: each
-firmware, BIOS and driver of the machine.
+firmware, BIOS and driver of the machine. There are also
+
+  KELVO_ComputerSystem, KELVO_SPComputerSystem, KELVO_NetworkPort
+                           computers, management controllers, network ports
+  KELVO_InstalledSoftwareIdentity
+                           which software is installed on which computer
+  KELVO_BMCSoftwareIdentity, KELVO_BIOSSoftwareIdentity
+                           the firmware of management controllers, and BIOSes
+  KELVO_NetworkSoftwareIdentity
+                           the firmware of the first network device, each with
+                           the device's first port; for all others ask "swinv
+                           associators"
 
 Options:
   --format table|json|csv  table (default): the most telling properties, cut to
@@ -68,6 +86,7 @@ Options:
 Examples:
   swinv list
   swinv list --property Description,VersionString
+  swinv list KELVO_NetworkPort
   swinv list --format json --inventory server.json
 )";
 
@@ -96,8 +115,10 @@ constexpr std::string_view getHelp =
 
 Usage: swinv get OBJECT [OPTIONS]
 
-OBJECT is the InstanceID of a KELVO_SoftwareIdentity, or the object path of an
-instance of any class, as "swinv names" prints it.
+OBJECT is the InstanceID of a KELVO_SoftwareIdentity; an instance of any class
+in short, CLASS=NAME, as tables print it; or its object path, as "swinv names"
+prints it. Of the associations, KELVO_InstalledSoftwareIdentity alone can be
+asked for one at a time.
 
 Options:
   --format table|json|csv  table (default): a line for each property that has a
@@ -111,7 +132,54 @@ Options:
 
 Examples:
   swinv get 1@3b2
+  swinv get KELVO_NetworkPort=0000:3b:00.0/1
   swinv get 'root/cimv2:KELVO_SoftwareIdentity.InstanceID="1@3b2"' --format json
+)";
+
+constexpr std::string_view associatorsHelp =
+    R"(swinv associators - show what an object belongs to, and what belongs to it
+
+Usage: swinv associators OBJECT [OPTIONS]
+
+OBJECT is an InstanceID; CLASS=NAME, as tables print it; or an object path, as
+"swinv names" prints it.
+
+  of                       are shown                             along
+  any software element     the computer that it is installed on  Installed
+  "BIOS" firmware          its computer                          BIOS
+  "BMC Firmware"           its management controller             BMC
+  firmware of a network    the first port of its device, no      Network
+  device                   other
+  KELVO_ComputerSystem     all software; its BIOS                Installed, BIOS
+  KELVO_SPComputerSystem   its firmware                          BMC
+  KELVO_NetworkPort        all firmware of its device            Network
+
+The names of the associations are KELVO_InstalledSoftwareIdentity, and so on.
+Of several computers, each is shown the software of all. "swinv list
+KELVO_NetworkSoftwareIdentity" shows the first network device alone.
+
+Options:
+  --assoc-class CLASS      along this association, or those derived from it
+  --result-class CLASS     objects of this class, or of those derived from it
+  --role ROLE              where OBJECT is this end of the association: System,
+                           InstalledSoftware, Antecedent, Dependent
+  --result-role ROLE       where what is shown is that end
+  --names                  object paths, one a line, as these commands take them
+  --format table|json|csv  table (default): one for each class; json: a list of
+                           objects, each with its path as "@path"; csv: the
+                           path and a column for every property
+  --property NAME[,...]    these properties alone, in this order; repeatable
+  --inventory FILE         show the machine that an inventory file describes
+  --system-root DIR        show the machine whose sys/, proc/, lib/ are in DIR
+  --provider FILE          load this provider library, not the installed one
+  --log-level off|error|trace
+                           what the provider logs, on standard error (off)
+
+Examples:
+  swinv associators 1@3b2
+  swinv associators KELVO_NetworkPort=0000:3b:00.0/1 --names
+  swinv names KELVO_NetworkPort | while read -r port; do
+    swinv associators "$port" --property Description,VersionString; done
 )";
 
 constexpr std::string_view treeHelp =
@@ -123,6 +191,12 @@ A line for each node: its type, description, name and version, the devices that
 a driver drives, and in brackets the InstanceID of a software element, or the
 number before the "@" in the InstanceIDs of the software directly below the
 node. At the end stands what could not be read, and why.
+
+Behind a semicolon stands what the associations make of a software element:
+  on NAME                     installed on this computer
+  is its BIOS                 of that computer
+  runs its service processor  the firmware of its management controller
+  serves port NAME            the first port of the device that it is part of
 
 Options:
   --format table|json      json: the tree as an inventory file (default: table)
@@ -165,6 +239,8 @@ std::string_view helpText(std::optional<Command> command) {
       return namesHelp;
     case Command::Get:
       return getHelp;
+    case Command::Associators:
+      return associatorsHelp;
     case Command::Tree:
       return treeHelp;
     case Command::Capture:
@@ -181,6 +257,8 @@ std::string_view commandName(Command command) {
       return "names";
     case Command::Get:
       return "get";
+    case Command::Associators:
+      return "associators";
     case Command::Tree:
       return "tree";
     case Command::Capture:

@@ -6,6 +6,7 @@
 
 #include <memory>
 #include <string>
+#include <utility>
 
 namespace cli {
 
@@ -17,6 +18,9 @@ class JsonOutput : public RowWriter {
   /// The output must outlive the writer.
   JsonOutput(Columns columns, Output& output);
   ~JsonOutput() override;
+
+  /// The columns of the rows that follow: objects of one list may be of several kinds.
+  void use(Columns columns) { columns_ = std::move(columns); }
 
   void write(Row row) override;
   void finish() override;

@@ -13,8 +13,8 @@
 namespace cli {
 namespace {
 
-constexpr std::array<Command, 5> commands{Command::List, Command::Names, Command::Get, Command::Tree,
-                                          Command::Capture};
+constexpr std::array<Command, 6> commands{Command::List,        Command::Names, Command::Get,
+                                          Command::Associators, Command::Tree,  Command::Capture};
 
 /// A command line that makes no sense; the text says why.
 class UsageError : public std::runtime_error {
@@ -45,6 +45,11 @@ std::unique_ptr<CLI::App> makeParser(Raw& raw) {
   app->add_option("--provider", raw.provider);
   app->add_option("--log-level", raw.logLevel);
   app->add_flag("--force", raw.options.force);
+  app->add_option("--assoc-class", raw.options.associationClass);
+  app->add_option("--result-class", raw.options.resultClass);
+  app->add_option("--role", raw.options.role);
+  app->add_option("--result-role", raw.options.resultRole);
+  app->add_flag("--names", raw.options.namesOnly);
   app->add_option("--property", raw.properties)
       ->allow_extra_args(false)
       ->multi_option_policy(CLI::MultiOptionPolicy::TakeAll);
@@ -54,7 +59,7 @@ std::unique_ptr<CLI::App> makeParser(Raw& raw) {
     CLI::App* sub = app->add_subcommand(std::string(commandName(command)));
     if (command == Command::List || command == Command::Names) {
       sub->add_option("CLASS", raw.options.className);
-    } else if (command == Command::Get) {
+    } else if (command == Command::Get || command == Command::Associators) {
       sub->add_option("OBJECT", raw.options.object);
     } else if (command == Command::Capture) {
       sub->add_option("FILE", raw.options.captureFile);
@@ -103,10 +108,16 @@ void checkThatOptionsApply(const CLI::App& app, Command command) {
     const char* option;
     std::vector<Command> commands;
   };
-  const std::array<Rule, 4> rules{
-      Rule{"--format", {Command::List, Command::Names, Command::Get, Command::Tree}},
-      Rule{"--property", {Command::List, Command::Get}},
-      Rule{"--provider", {Command::List, Command::Names, Command::Get}}, Rule{"--force", {Command::Capture}}};
+  const std::array<Rule, 9> rules{
+      Rule{"--format", {Command::List, Command::Names, Command::Get, Command::Associators, Command::Tree}},
+      Rule{"--property", {Command::List, Command::Get, Command::Associators}},
+      Rule{"--provider", {Command::List, Command::Names, Command::Get, Command::Associators}},
+      Rule{"--force", {Command::Capture}},
+      Rule{"--assoc-class", {Command::Associators}},
+      Rule{"--result-class", {Command::Associators}},
+      Rule{"--role", {Command::Associators}},
+      Rule{"--result-role", {Command::Associators}},
+      Rule{"--names", {Command::Associators}}};
   for (const Rule& rule : rules) {
     const auto& known = rule.commands;
     if (app.count(rule.option) != 0 && std::find(known.begin(), known.end(), command) == known.end()) {
@@ -116,11 +127,28 @@ void checkThatOptionsApply(const CLI::App& app, Command command) {
   if (app.count("--inventory") != 0 && app.count("--system-root") != 0) {
     throw UsageError("--inventory and --system-root name two machines; give one of them");
   }
+  if (app.count("--names") != 0 && app.count("--property") != 0) {
+    throw UsageError("--names shows no properties; leave out --names or --property");
+  }
+}
+
+/// An empty name would silently mean "any".
+void checkNames(const CLI::App& app, const Options& options) {
+  for (const auto& [option, name] :
+       {std::pair("--assoc-class", &options.associationClass),
+        std::pair("--result-class", &options.resultClass), std::pair("--role", &options.role),
+        std::pair("--result-role", &options.resultRole)}) {
+    if (app.count(option) != 0 && name->empty()) {
+      throw UsageError(std::string(option) + " needs a name, and got an empty one");
+    }
+  }
 }
 
 void checkArguments(const Options& options) {
-  if (options.command == Command::Get && options.object.empty()) {
-    throw UsageError("'swinv get' needs an InstanceID or an object path, as 'swinv names' prints them");
+  const bool takesObject = options.command == Command::Get || options.command == Command::Associators;
+  if (takesObject && options.object.empty()) {
+    throw UsageError("'swinv " + std::string(commandName(options.command)) +
+                     "' needs an InstanceID or an object path, as 'swinv names' prints them");
   }
   if (options.command == Command::Capture && options.captureFile.empty()) {
     throw UsageError("'swinv capture' needs a file to write, or - for standard output");
@@ -152,7 +180,7 @@ std::vector<std::string> namesIn(const std::vector<std::string>& lists) {
 Options interpret(const CLI::App& app, Raw raw) {
   const std::optional<Command> command = commandOf(app);
   if (!command) {
-    throw UsageError("no command given; there are list, names, get, tree and capture");
+    throw UsageError("no command given; there are list, names, get, associators, tree and capture");
   }
   checkThatOptionsApply(app, *command);
   Options options = std::move(raw.options);
@@ -170,6 +198,7 @@ Options interpret(const CLI::App& app, Raw raw) {
   options.inventory = fileOption(app, "--inventory", raw.inventory);
   options.systemRoot = fileOption(app, "--system-root", raw.systemRoot);
   options.provider = fileOption(app, "--provider", raw.provider);
+  checkNames(app, options);
   checkArguments(options);
   return options;
 }

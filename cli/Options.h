@@ -8,18 +8,24 @@
 
 namespace cli {
 
-enum class Command { List, Names, Get, Tree, Capture };
+enum class Command { List, Names, Get, Associators, Tree, Capture };
 enum class Format { Table, Json, Csv };
 enum class LogLevel { Off, Error, Trace };
 
 struct Options {
   Command command = Command::List;
   std::string className = "KELVO_SoftwareIdentity";
-  std::string object;                   ///< get: an InstanceID or an object path
-  std::string captureFile;              ///< capture: the file, "-" for standard output
-  bool force = false;                   ///< capture: replace an existing file
-  Format format = Format::Table;        ///< list, names, get, tree
-  std::vector<std::string> properties;  ///< list, get: in the order given; empty: those the format chooses
+  std::string object;             ///< get, associators: an InstanceID or an object path
+  std::string associationClass;   ///< associators: along this class alone; empty: along any
+  std::string resultClass;        ///< associators: objects of this class alone; empty: of any
+  std::string role;               ///< associators: where the object stands in it; empty: in any
+  std::string resultRole;         ///< associators: where the others stand in it; empty: in any
+  bool namesOnly = false;         ///< associators: object paths, no instances
+  std::string captureFile;        ///< capture: the file, "-" for standard output
+  bool force = false;             ///< capture: replace an existing file
+  Format format = Format::Table;  ///< all but capture
+  std::vector<std::string>
+      properties;  ///< list, get, associators: in the order given; empty: the format chooses
   std::optional<std::filesystem::path> inventory;
   std::optional<std::filesystem::path> systemRoot;
   std::optional<std::filesystem::path> provider;

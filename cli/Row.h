@@ -15,9 +15,11 @@ struct DateTime {
   friend bool operator==(const DateTime&, const DateTime&) = default;
 };
 
-/// A reference as a WBEM URI.
+/// A reference as a WBEM URI, and in the short form that tables show; empty: they show the URI without host
+/// and namespace.
 struct Reference {
   std::string uri;
+  std::string brief = {};
   friend bool operator==(const Reference&, const Reference&) = default;
 };
 

@@ -75,10 +75,14 @@ std::string hintFor(const cimom::Status& status, bool logs) {
 }
 
 /// This system's own classes; the rest of the schema is what they derive from.
+bool isOwn(const cimom::SchemaClass& info) {
+  return !info.name().starts_with("CIM_");
+}
+
 std::string ownClasses(const cimom::ClassRepository& classes) {
   std::string names;
   for (const cimom::SchemaClass* each : classes.all()) {
-    if (!each->name().starts_with("CIM_")) {
+    if (isOwn(*each)) {
       names.append(names.empty() ? "" : ", ").append(each->name());
     }
   }
@@ -115,22 +119,38 @@ const cimom::SchemaClass& Session::classNamed(const std::string& name) const {
       (nearest ? "; did you mean " + *nearest + "?" : "; try " + ownClasses(manager_->classes())));
 }
 
-void Session::conclude(const cimom::Outcome& outcome, const std::string& what, RowWriter& writer,
+std::vector<const cimom::SchemaClass*> Session::publishedClasses(const cimom::SchemaClass* top) const {
+  std::vector<const cimom::SchemaClass*> classes;
+  for (const cimom::SchemaClass* each : manager_->classes().all()) {
+    if (isOwn(*each) && !each->isAssociation() && (top == nullptr || each->isA(*top))) {
+      classes.push_back(each);
+    }
+  }
+  if (classes.empty() && top != nullptr) {
+    classes.push_back(top);
+  }
+  return classes;
+}
+
+void Session::throwIfFailed(const cimom::Outcome& outcome, const std::string& what) const {
+  const std::string& description = outcome.status.description;
+  if (outcome.status.code != CMPI_RC_OK) {
+    throw CommandError(statusName(outcome.status.code) + ": " + what +
+                       (description.empty() ? "" : ": " + description) + hintFor(outcome.status, logs_));
+  }
+}
+
+void Session::conclude(const cimom::Outcome& outcome, const std::string& what, Document& document,
                        Output& output) const {
-  const bool failed = outcome.status.code != CMPI_RC_OK;
   if (!outcome.done && outcome.delivered == 0 && source_.inventory) {
     // A provider cannot say why the framework had nothing for it; the file itself can.
     static_cast<void>(readTreeOf(source_));
   }
-  if (!failed || outcome.delivered > 0) {
-    writer.finish();
+  if (outcome.status.code == CMPI_RC_OK || outcome.delivered > 0) {
+    document.finish();
     output.flush();
   }
-  if (failed) {
-    const std::string& description = outcome.status.description;
-    throw CommandError(statusName(outcome.status.code) + ": " + what +
-                       (description.empty() ? "" : ": " + description) + hintFor(outcome.status, logs_));
-  }
+  throwIfFailed(outcome, what);
   if (!outcome.done) {
     complain(logs_ ? "the provider stopped early; its log above says why"
                    : "the provider stopped early; --log-level error shows why");

@@ -28,7 +28,7 @@ std::string textOf(const Scalar& value, const Column& column) {
     return readableDate(date->text).value_or(date->text);
   }
   if (const auto* reference = std::get_if<Reference>(&value)) {
-    return std::string(shortReference(reference->uri));
+    return reference->brief.empty() ? std::string(shortReference(reference->uri)) : reference->brief;
   }
   return scalarText(value);
 }

@@ -49,8 +49,8 @@ class Table : public RowWriter {
   std::vector<Cells> rows_;
 };
 
-/// A value as tables print it: dates as dates, numbers by what they stand for, references without host and
-/// namespace, lists joined by commas, null as the empty text.
+/// A value as tables print it: dates as dates, numbers by what they stand for, references in short, lists
+/// joined by commas, null as the empty text.
 std::string cellText(const Value& value, const Column& column, Charset charset);
 
 }  // namespace cli

@@ -1,6 +1,7 @@
 #include <agent/framework/Names.h>
 #include <agent/framework/OwnNumbers.h>
 #include <cli/Text.h>
+#include <cli/TreeMarks.h>
 #include <cli/TreePrinter.h>
 
 #include <optional>
@@ -22,10 +23,6 @@ struct Branches {
 
 constexpr Branches utf8Branches{"├─ ", "└─ ", "│  ", "   "};
 constexpr Branches asciiBranches{"|- ", "`- ", "|  ", "   "};
-
-bool isSoftware(int type) {
-  return type == lexicon::BiosNode || type == lexicon::FirmwareNode || type == lexicon::DriverNode;
-}
 
 /// The InstanceID of a software element; of any other node the number that the InstanceIDs of the software
 /// below it start with.
@@ -64,6 +61,10 @@ std::string nodeText(const NodeTree& tree, NodeTree::Index node) {
   }
   if (const auto devices = tree.text(node, agent::DrivenDevicesProperty)) {
     text.append(", drives ").append(*devices);
+  }
+  if (isSoftware(tree.type(node))) {
+    const std::string mark = associationMark(tree, node);
+    text.append(mark.empty() ? "" : "; ").append(mark);
   }
   return text.append("  [").append(identifier(tree, node)).append("]");
 }

@@ -33,6 +33,8 @@ void run(const cli::Options& options, cli::Output& output) {
       return cli::runNames(options, output);
     case cli::Command::Get:
       return cli::runGet(options, output);
+    case cli::Command::Associators:
+      return cli::runAssociators(options, output);
     case cli::Command::Tree:
       return cli::runTree(options, output);
     case cli::Command::Capture:

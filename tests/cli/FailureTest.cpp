@@ -74,7 +74,8 @@ TEST(Failure, UnknownClassesAndPropertiesAreNamed) {
   expectFailure(swinv({"list", "KELVO_SoftwareIdentty"}), 1,
                 AllOf(HasSubstr("CIM_ERR_INVALID_CLASS"), HasSubstr("did you mean KELVO_SoftwareIdentity?")));
   expectFailure(swinv({"names", "Nonsense"}), 1,
-                AllOf(HasSubstr("CIM_ERR_INVALID_CLASS"), HasSubstr("try KELVO_SoftwareIdentity")));
+                AllOf(HasSubstr("CIM_ERR_INVALID_CLASS"), HasSubstr("; try KELVO_"),
+                      HasSubstr(", KELVO_SoftwareIdentity,")));
   expectFailure(swinv({"list", "--property", "Descripton", "--inventory", small}), 1,
                 AllOf(HasSubstr("CIM_ERR_NO_SUCH_PROPERTY"), HasSubstr("did you mean Description?")));
 }
@@ -150,9 +151,13 @@ TEST(Failure, ASchemaWithoutRegistrationsIsNamed) {
   EXPECT_EQ(moved.list().standardOutput, swinv({"list", "--inventory", small}).standardOutput);
   const auto message =
       AllOf(HasSubstr("no provider is registered"), HasSubstr(moved.folder().string()), HasSubstr("install"));
-  std::ofstream(moved.registration(), std::ios::trunc).close();
+  for (const char* file : {"SoftwareInventoryProvider.reg", "KelvoEndpointProvider.reg"}) {
+    ASSERT_TRUE(fs::exists(moved.folder() / file));
+    std::ofstream(moved.folder() / file, std::ios::trunc).close();
+  }
   expectFailure(moved.list(), 1, message);
   fs::remove(moved.registration());
+  fs::remove(moved.folder() / "KelvoEndpointProvider.reg");
   expectFailure(moved.list(), 1, message);
 }
 

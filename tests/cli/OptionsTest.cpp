@@ -166,7 +166,7 @@ TEST(Help, HelpAndManualNameEveryOption) {
 TEST(Help, HelpAndManualNameNoOptionThatIsNone) {
   std::vector<std::string> texts{manual(), std::string(cli::helpText(std::nullopt))};
   for (const Command command :
-       {Command::List, Command::Names, Command::Get, Command::Tree, Command::Capture}) {
+       {Command::List, Command::Names, Command::Get, Command::Associators, Command::Tree, Command::Capture}) {
     texts.emplace_back(cli::helpText(command));
   }
   for (const std::string& text : texts) {
@@ -176,7 +176,7 @@ TEST(Help, HelpAndManualNameNoOptionThatIsNone) {
 
 TEST(Help, TheManualNamesEveryCommand) {
   for (const Command command :
-       {Command::List, Command::Names, Command::Get, Command::Tree, Command::Capture}) {
+       {Command::List, Command::Names, Command::Get, Command::Associators, Command::Tree, Command::Capture}) {
     EXPECT_THAT(manual(), HasSubstr("swinv " + std::string(cli::commandName(command))));
     EXPECT_THAT(std::string(cli::helpText(command)), HasSubstr("Example"));
   }
@@ -185,7 +185,8 @@ TEST(Help, TheManualNamesEveryCommand) {
 TEST(Help, LinesFitATerminal) {
   for (const std::optional<Command> command :
        {std::optional<Command>(), std::optional(Command::List), std::optional(Command::Names),
-        std::optional(Command::Get), std::optional(Command::Tree), std::optional(Command::Capture)}) {
+        std::optional(Command::Get), std::optional(Command::Associators), std::optional(Command::Tree),
+        std::optional(Command::Capture)}) {
     std::istringstream lines{std::string(cli::helpText(command))};
     for (std::string line; std::getline(lines, line);) {
       EXPECT_LE(line.size(), 80U) << line;

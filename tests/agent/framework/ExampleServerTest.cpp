@@ -96,7 +96,7 @@ TEST_F(ExampleServer, HasThreeNetworkDevicesThoseWithFirmwareAndPortFirst) {
     EXPECT_EQ(tree.parent(device), 0U);
     firmwareAndPorts.emplace_back(childrenOf(device, FirmwareNode), childrenOf(device, NetworkPortNode));
   }
-  EXPECT_THAT(firmwareAndPorts, ElementsAre(std::pair(1U, 2U), std::pair(1U, 1U), std::pair(0U, 1U)));
+  EXPECT_THAT(firmwareAndPorts, ElementsAre(std::pair(2U, 2U), std::pair(1U, 1U), std::pair(0U, 1U)));
   EXPECT_LT(tree.position(devices[0]), tree.position(devices[1]));
 }
 
