@@ -53,12 +53,14 @@ CMPIObjectPath* CMPINetworkSoftwareIdentity::locateNetwork(const CMPIObjectPath*
 
 CMPIObjectPath* CMPINetworkSoftwareIdentity::locateIdentity(const CMPIObjectPath* objectPath) {
   const TraceScope scope(loggerCMPINetworkSoftwareIdentity, " objectPath=", objectPath);
+  // Unlike the other ways to locate an end, this one resolves a path without keys, too.
+  CMPIObjectPath* located = ProviderUtilities::createObjectPath(broker, softwareIdentityClassName, nameSpace);
   if (ProviderUtilities::getKeyCount(objectPath) == 0) {
-    return withKeys(ProviderUtilities::createObjectPath(broker, softwareIdentityClassName, nameSpace),
-                    resolver.getSoftwareIdentityMoniker());
+    return withKeys(located, resolver.getSoftwareIdentityMoniker());
   }
-  return locate(softwareIdentityClassName, objectPath,
-                [this](Moniker& port) { return resolver.getSoftwareIdentityMoniker(port); });
+  Moniker port;
+  ProviderUtilities::transformObjectPathToMoniker(objectPath, port);
+  return withKeys(located, resolver.getSoftwareIdentityMoniker(port));
 }
 
 CMPINetworkSoftwareIdentity::operator bool() {
