@@ -154,6 +154,15 @@ std::size_t countOf(const std::vector<std::string>& calls, const std::string& ca
   return count;
 }
 
+std::size_t entriesOf(const standin::World& world, const std::string& function, const std::string& file) {
+  std::size_t count = 0;
+  for (const standin::LogLine& line : world.log) {
+    const bool isEntry = !line.trace && line.text.rfind("ENTERING", 0) == 0;
+    count += isEntry && line.function == function && line.file == file ? 1 : 0;
+  }
+  return count;
+}
+
 std::vector<std::string> logTexts(const standin::World& world, int level, bool trace) {
   static const std::regex lineNumber("(Line:|line) [0-9]+");
   std::vector<std::string> texts;

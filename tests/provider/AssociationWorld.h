@@ -112,6 +112,9 @@ class MachineTest : public testing::Test {
 /// Calls by name; a call with arguments counts by what stands before the parenthesis, too.
 std::size_t countOf(const std::vector<std::string>& calls, const std::string& call);
 
+/// How often a function of a source file was entered, by the log channel.
+std::size_t entriesOf(const standin::World& world, const std::string& function, const std::string& file);
+
 /// The texts of a level, without their line numbers ("[Line: 12]" becomes "[Line: N]", "line 12" "line N").
 std::vector<std::string> logTexts(const standin::World& world, int level, bool trace = false);
 
