@@ -38,10 +38,10 @@ using PropertyList = std::optional<std::vector<std::string>>;
 
 /// What narrows an association request; an empty text narrows nothing. Names ignore case.
 struct AssociationQuery {
-  std::string associationClass;  ///< the association's class, or an ancestor of it
-  std::string resultClass;       ///< the class of the object at the far end, or an ancestor of it
-  std::string role;              ///< the association's reference to the source
-  std::string resultRole;        ///< the association's reference to the far end
+  std::string associationClass = {};  ///< the association's class, or an ancestor of it
+  std::string resultClass = {};       ///< the class of the object at the far end, or an ancestor of it
+  std::string role = {};              ///< the association's reference to the source
+  std::string resultRole = {};        ///< the association's reference to the far end
 };
 
 class ObjectManager {

@@ -180,12 +180,31 @@ TEST_F(ObjectPathTest, ComparesByClassAndKeys) {
   EXPECT_FALSE(samePath(*ObjectPath::from(left), *ObjectPath::from(right)));
   right->ft->addKey(right, "uint8", &seven, CMPI_sint64);
   EXPECT_TRUE(samePath(*ObjectPath::from(left), *ObjectPath::from(right)));
+  EXPECT_EQ(pathHash(*ObjectPath::from(left)), pathHash(*ObjectPath::from(right)));
   right->ft->addKey(right, "Sint8", &minus, CMPI_uint64);
   EXPECT_FALSE(samePath(*ObjectPath::from(left), *ObjectPath::from(right)));
   add(right, "Sint8", "-1");
   EXPECT_FALSE(samePath(*ObjectPath::from(left), *ObjectPath::from(right)));
   right->ft->setClassName(right, "Test_Thing");
   EXPECT_FALSE(samePath(*ObjectPath::from(left), *ObjectPath::from(right)));
+}
+
+TEST_F(ObjectPathTest, ItsHashTellsOtherPathsApart) {
+  const auto hash = [](const CMPIObjectPath* path) { return pathHash(*ObjectPath::from(path)); };
+  EXPECT_EQ(hash(newKeyedPath("a")), hash(newKeyedPath("a")));
+  EXPECT_NE(hash(newKeyedPath("a")), hash(newKeyedPath("b")));
+  EXPECT_NE(hash(newPath("Test_Thing")), hash(newPath("Test_Link")));
+  const auto link = [this](const char* left, const char* right) {
+    CMPIObjectPath* const path = newPath("Test_Link");
+    CMPIValue end{};
+    end.ref = newKeyedPath(left);
+    path->ft->addKey(path, "Left", &end, CMPI_ref);
+    end.ref = newKeyedPath(right);
+    path->ft->addKey(path, "Right", &end, CMPI_ref);
+    return path;
+  };
+  EXPECT_EQ(hash(link("a", "b")), hash(link("a", "b")));
+  EXPECT_NE(hash(link("a", "b")), hash(link("b", "a")));
 }
 
 }  // namespace
