@@ -92,8 +92,8 @@ TEST_F(References, areEnumeratedOnceFromAnAncestor) {
           "TEST_HoldsKind(TEST_System s,TEST_Port kind)", "TEST_Peer(TEST_Firmware f1,TEST_Firmware f2)",
           "TEST_Peer(TEST_Firmware f3,TEST_Firmware f1)", "TEST_HoldsMore(TEST_System s,TEST_Port more)"));
   EXPECT_THAT(names("TEST_ElementSoftware").objects,
-              UnorderedUnorderedElementsAre("TEST_Runs(TEST_Controller c,TEST_Firmware f1)",
-                                            "TEST_Serves(TEST_Firmware f1,TEST_Port p)"));
+              UnorderedElementsAre("TEST_Runs(TEST_Controller c,TEST_Firmware f1)",
+                                   "TEST_Serves(TEST_Firmware f1,TEST_Port p)"));
 }
 
 // What a name prints can be typed back, references with quotes in quotes included, and names the instance.
