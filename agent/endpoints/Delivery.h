@@ -4,24 +4,15 @@
 #pragma once
 
 #include <agent/endpoints/Endpoints.h>
+#include <agent/endpoints/Failure.h>
 
 #include <cmpi/cmpidt.h>
 
-#include <stdexcept>
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace agent::endpoints {
-
-/// Why a request ends without success: the status of the answer, and its message.
-class Failure : public std::runtime_error {
- public:
-  Failure(CMPIrc code, const std::string& message) : std::runtime_error(message), code_(code) {}
-  [[nodiscard]] CMPIrc code() const { return code_; }
-
- private:
-  CMPIrc code_;
-};
 
 /// What one request delivers. Objects belong to the object manager, as everywhere in CMPI.
 class Delivery {

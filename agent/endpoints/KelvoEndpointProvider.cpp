@@ -86,7 +86,7 @@ void enumerate(const CMPIInstanceMI* mi, const CMPIResult* result, const CMPIObj
                Deliver deliver) {
   const Kind& kind = kindOfRequest(path);
   const RequestPath wanted(path, kind);
-  Delivery delivery(brokerOf(mi), result, ProviderUtilities::getNamespace(path), kind.className);
+  Delivery delivery(brokerOf(mi), result, wanted.nameSpace(), kind.className);
   Endpoints endpoints(kind, [&](const Keys& keys) { return wanted.passes(keys); });
   for (; endpoints; ++endpoints) {
     deliver(delivery, endpoints);
@@ -126,7 +126,7 @@ CMPIStatus getInstance(CMPIInstanceMI* mi, const CMPIContext* /*context*/, const
       throw Failure(CMPI_RC_ERR_NOT_FOUND,
                     std::string("there is no ") + kind.className + "." + wanted.text());
     }
-    Delivery delivery(brokerOf(mi), result, ProviderUtilities::getNamespace(path), kind.className);
+    Delivery delivery(brokerOf(mi), result, wanted.nameSpace(), kind.className);
     delivery.instance(endpoints.keys(), endpoints.properties(), properties);
     delivery.done();
   });

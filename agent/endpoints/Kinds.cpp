@@ -26,8 +26,9 @@ struct Word {
 };
 
 // CIM_EnabledLogicalElement.EnabledState.
+constexpr std::uint16_t enabled = 2;
 constexpr std::array<Word, 4> enabledStates{{
-    {"up", 2},        // Enabled
+    {"up", enabled},
     {"disabled", 3},  // Disabled
     {"down", 6},      // Enabled but Offline
     {"testing", 7},   // In Test
@@ -87,7 +88,6 @@ std::vector<Property> systemProperties(Instrumentation& node, std::uint16_t dedi
   std::vector<Property> properties;
   addElementName(properties, textOf(node, lexicon::NameProperty));
   properties.push_back({"Dedicated", std::vector{dedicated}});
-  addEnabledState(properties, node);
   return properties;
 }
 
@@ -105,7 +105,9 @@ std::optional<Keys> computerKeys(Instrumentation& node, ComputerNames& /*compute
 }
 
 std::vector<Property> computerProperties(Instrumentation& node) {
-  return systemProperties(node, notDedicated);
+  std::vector<Property> properties = systemProperties(node, notDedicated);
+  addEnabledState(properties, node);
+  return properties;
 }
 
 // ---- Management controllers: the nodes of their firmware. A controller bears the name of the computer above
@@ -119,8 +121,14 @@ std::optional<Keys> controllerKeys(Instrumentation& node, ComputerNames& compute
   return systemKeys(controllerClass, computers.of(node));
 }
 
+// Firmware that is in use runs on a controller that is enabled; of its other states (a spare image, say) the
+// controller has none.
 std::vector<Property> controllerProperties(Instrumentation& node) {
-  return systemProperties(node, managementController);
+  std::vector<Property> properties = systemProperties(node, managementController);
+  if (textOf(node, own(StateProperty)) == "enabled") {
+    properties.push_back({"EnabledState", enabled});
+  }
+  return properties;
 }
 
 // ---- Network ports.

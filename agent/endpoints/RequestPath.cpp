@@ -1,25 +1,47 @@
+#include <agent/endpoints/Failure.h>
 #include <agent/endpoints/RequestPath.h>
 #include <agent/framework/CmpiAccess.h>
+
+#include <Oru/ProviderUtilities.h>
+#include <cmpi/cmpift.h>
 
 #include <algorithm>
 
 namespace agent::endpoints {
 
-RequestPath::RequestPath(const CMPIObjectPath* path, const Kind& kind) {
-  const auto* table = cmpi::tableOf(path);
+RequestPath::RequestPath(const CMPIObjectPath* path, const Kind& kind)
+    : nameSpace_(Oru::ProviderUtilities::getNamespace(path)) {
   for (const char* name : kind.keyNames) {
-    Wanted wanted{name, false, std::nullopt};
-    const std::optional<CMPIData> data =
-        table == nullptr ? std::nullopt
-                         : cmpi::findByName<CMPIObjectPath>(path, name, table->getKey, table->getKeyCount,
-                                                            table->getKeyAt);
-    if (data && cmpi::hasValue(*data)) {
-      wanted.isGiven = true;
-      if (const char* chars = cmpi::charsOf(*data)) {
-        wanted.value = chars;
-      }
+    wanted_.push_back({name, false, std::nullopt});
+  }
+  const auto* table = cmpi::tableOf(path);
+  CMPIStatus status{CMPI_RC_OK, nullptr};
+  const CMPICount count = table->getKeyCount(path, &status);
+  for (CMPICount index = 0; status.rc == CMPI_RC_OK && index < count; ++index) {
+    CMPIString* name = nullptr;
+    const CMPIData value = table->getKeyAt(path, index, &name, &status);
+    if (status.rc == CMPI_RC_OK) {
+      take(cmpi::charsOf(name), value);
     }
-    wanted_.push_back(std::move(wanted));
+  }
+  if (nameSpace_.empty() || status.rc != CMPI_RC_OK) {
+    throw Failure(CMPI_RC_ERR_FAILED, std::string("the object manager does not tell the ") +
+                                          (nameSpace_.empty() ? "namespace" : "keys") +
+                                          " of the request's path");
+  }
+}
+
+/// Of several keys of one name the first stands. One without a value narrows nothing.
+void RequestPath::take(const char* name, const CMPIData& value) {
+  const auto found = std::find_if(wanted_.begin(), wanted_.end(), [&](const Wanted& wanted) {
+    return name != nullptr && cmpi::sameName(wanted.name, name);
+  });
+  if (found == wanted_.end() || found->isGiven || !cmpi::hasValue(value)) {
+    return;
+  }
+  found->isGiven = true;
+  if (const char* chars = cmpi::charsOf(value)) {
+    found->value = chars;
   }
 }
 

@@ -13,12 +13,16 @@ namespace agent::endpoints {
 
 class RequestPath {
  public:
-  /// Reads the keys of `kind` from `path`; others say nothing about its elements and are left out.
+  /// Reads the namespace and the keys of `kind` from `path`; other keys say nothing about its elements and
+  /// are left out. Throws `Failure` where these cannot be read: a key that is overlooked would let elements
+  /// pass that nobody asked for.
   RequestPath(const CMPIObjectPath* path, const Kind& kind);
 
   /// Whether an element has every value that the path gives. Values are compared exactly, class names too; a
   /// value that is no text is that of no element.
   [[nodiscard]] bool passes(const Keys& keys) const;
+
+  [[nodiscard]] const std::string& nameSpace() const { return nameSpace_; }
 
   /// The first key that the path lacks, or null: then it names one element.
   [[nodiscard]] const char* missingKey() const;
@@ -32,6 +36,9 @@ class RequestPath {
     bool isGiven = false;
     std::optional<std::string> value;  ///< nothing: it is no text
   };
+  void take(const char* name, const CMPIData& value);
+
+  std::string nameSpace_;
   std::vector<Wanted> wanted_;  ///< in the order of the kind's keys
 };
 
