@@ -87,10 +87,12 @@ class ObjectManager {
   /// the answer is empty. What a class delivers that one asked before it delivered too is left out; that
   /// takes memory for the paths of the answer where several classes are asked, else none.
   ///
-  /// Roles go by what stands in an association's references as its provider delivers them: the first path
-  /// that an enumeration of its names gives tells the class in each. It is enumerated once, when a request
-  /// first names one of its references as a role, and asked anew as long as it delivers none. Until
-  /// then, and for classes that stand in no reference of that path, the declaration counts.
+  /// Roles go by what the provider delivers in an association's references, not by their declaration: the
+  /// first path of an enumeration of the association's names tells the class in each. The enumeration is
+  /// made, and costs its time, when a request first names one of these references, and again only as long as
+  /// it delivered nothing. Until then, and for a class that stands in no reference of that path, the
+  /// declaration counts. Where one class stands at both ends it cannot tell them apart: that is left to the
+  /// provider, which is given the roles and the result class too.
   ///
   /// CMPI_RC_ERR_INVALID_PARAMETER for a source whose text is no path, whose class the schema lacks or whose
   /// keys do not fit it, an association class that the schema lacks or that is no association, and a result
