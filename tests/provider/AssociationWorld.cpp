@@ -21,13 +21,6 @@ const standin::Instance* unwrap(const CMPIInstance* instance) {
   return instance != nullptr ? static_cast<standin::Instance*>(instance->hdl) : nullptr;
 }
 
-void serve(standin::World& world, const char* className, const char* key,
-           const std::vector<std::string>& values) {
-  for (const std::string& value : values) {
-    world.served[className].instances.push_back(world.newInstance(className, {{key, value}}));
-  }
-}
-
 }  // namespace
 
 void setUpMachine(standin::World& world) {
@@ -48,9 +41,9 @@ void setUpMachine(standin::World& world) {
       {44, "d1", "c0", "c0", "driver of alpha", {}, {}},
       {44, "d2", "c1", "c1", "driver of beta", {}, {}},
   };
-  serve(world, "KELVO_ComputerSystem", "Name", {"alpha", "beta"});
-  serve(world, "KELVO_SPComputerSystem", "Name", {"alpha"});
-  serve(world, "KELVO_NetworkPort", "DeviceID", {"eth0", "eth1", "eth2"});
+  serveInstances(world, "KELVO_ComputerSystem", "Name", {"alpha", "beta"});
+  serveInstances(world, "KELVO_SPComputerSystem", "Name", {"alpha"});
+  serveInstances(world, "KELVO_NetworkPort", "DeviceID", {"eth0", "eth1", "eth2"});
 }
 
 CMPIObjectPath* path(const char* className, const Keys& keys, const References& references) {
@@ -136,7 +129,7 @@ std::string textOf(Oru::Moniker moniker) {
   return text;
 }
 
-standin::Node& MachineTest::node(const std::string& text) {
+standin::Node& nodeOf(standin::World& world, const std::string& text) {
   for (standin::Node& candidate : world.nodes) {
     if (candidate.text == text) {
       return candidate;
@@ -144,6 +137,15 @@ standin::Node& MachineTest::node(const std::string& text) {
   }
   ADD_FAILURE() << "no node " << text;
   return world.nodes.front();
+}
+
+void serveInstances(standin::World& world, const char* className, const char* key,
+                    const std::vector<std::string>& values) {
+  standin::Served answer;
+  for (const std::string& value : values) {
+    answer.instances.push_back(world.newInstance(className, {{key, value}}));
+  }
+  world.served[className] = answer;
 }
 
 std::size_t countOf(const std::vector<std::string>& calls, const std::string& call) {

@@ -23,6 +23,13 @@ using References = std::vector<std::pair<std::string, CMPIObjectPath*>>;
 /// providers serve both computers, alpha's service processor, and the ports.
 void setUpMachine(standin::World& world);
 
+/// The node with that path text, to be altered.
+standin::Node& nodeOf(standin::World& world, const std::string& text);
+
+/// Another provider's answer: instances with one key each, narrowed by the keys that are asked about.
+void serveInstances(standin::World& world, const char* className, const char* key,
+                    const std::vector<std::string>& values);
+
 // InstanceIDs of that machine's software, in the order of the walk.
 inline const std::string bios = "192@f1";
 inline const std::string bmc = "224@f2";
@@ -101,7 +108,7 @@ class MachineTest : public testing::Test {
     return world.calls;
   }
 
-  standin::Node& node(const std::string& text);
+  standin::Node& node(const std::string& text) { return nodeOf(world, text); }
   /// What a class answers when its instances are asked for.
   standin::Served& served(const char* className) { return world.served.at(className); }
 

@@ -59,11 +59,7 @@ class FirmwareAssociation : public MachineTest {
     return thrownBy<InstrumentationException>([&] { const Adapter adapter(&broker, nullptr, given); });
   }
   void serveComputers(const std::vector<std::string>& names) {
-    standin::Served answer;
-    for (const std::string& name : names) {
-      answer.instances.push_back(world.newInstance(Kind::computerClass, {{"Name", name}}));
-    }
-    world.served[Kind::computerClass] = answer;
+    serveInstances(world, Kind::computerClass, "Name", names);
   }
 
   CMPIObjectPath* classPath() { return path(Kind::className); }

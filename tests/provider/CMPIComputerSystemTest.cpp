@@ -24,12 +24,8 @@ class ComputerSystemEnd : public MachineTest {
   ComputerSystemEnd() { serveComputers({"alpha", "beta", "gamma"}); }
 
   void serveComputers(const std::vector<std::string>& names) {
-    standin::Served answer;
-    for (const std::string& name : names) {
-      answer.instances.push_back(world.newInstance("KELVO_ComputerSystem", {{"Name", name}}));
-    }
-    answer.narrows = false;
-    world.served["KELVO_ComputerSystem"] = answer;
+    serveInstances(world, "KELVO_ComputerSystem", "Name", names);
+    answer().narrows = false;
   }
 
   standin::Served& answer() { return served("KELVO_ComputerSystem"); }

@@ -24,11 +24,7 @@ class NetworkPortEnd : public MachineTest {
   NetworkPortEnd() { servePorts({"A", "B", "C"}); }
 
   void servePorts(const std::vector<std::string>& ids) {
-    standin::Served answer;
-    for (const std::string& id : ids) {
-      answer.instances.push_back(world.newInstance("KELVO_NetworkPort", {{"DeviceID", id}}));
-    }
-    world.served["KELVO_NetworkPort"] = answer;
+    serveInstances(world, "KELVO_NetworkPort", "DeviceID", ids);
   }
 
   standin::Served& answer() { return served("KELVO_NetworkPort"); }

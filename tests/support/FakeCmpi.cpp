@@ -40,10 +40,20 @@ std::size_t sizeOf(CMPIType type) {
 }  // namespace
 
 FakeCmpi::FakeCmpi()
-    : factory{}, stringTable{}, pathTable{}, instanceTable{}, arrayTable{}, dateTimeTable{}, broker_{} {
+    : upcalls{},
+      factory{},
+      stringTable{},
+      pathTable{},
+      instanceTable{},
+      arrayTable{},
+      dateTimeTable{},
+      enumerationTable{},
+      broker_{} {
   broker_.hdl = this;
+  broker_.bft = &upcalls;
   broker_.eft = &factory;
   fillFactory();
+  fillUpcalls();
   fillPathTable();
   fillObjectTables();
 }
@@ -226,6 +236,41 @@ void FakeCmpi::fillFactory() {
   };
 }
 
+void FakeCmpi::fillUpcalls() {
+  upcalls.brokerVersion = CMPICurrentVersion;
+  upcalls.brokerName = "FakeCmpi";
+  upcalls.enumerateInstances = [](const CMPIBroker* broker, const CMPIContext*, const CMPIObjectPath* path,
+                                  const char**, CMPIStatus* status) {
+    auto* fake = of<FakeCmpi>(broker);
+    auto& object = fake->enumerations_.emplace_back();
+    object = {{&object, &fake->enumerationTable}, fake, {}, 0};
+    CMPIEnumeration* made = fake->answer("enumerateInstances", status, &object.handle);
+    const CMPIrc rc = fake->source ? fake->source(path, object.instances) : CMPI_RC_ERR_INVALID_CLASS;
+    if (rc != CMPI_RC_OK) {
+      set(status, rc);
+      return static_cast<CMPIEnumeration*>(nullptr);
+    }
+    return made;
+  };
+  enumerationTable.ftVersion = CMPICurrentVersion;
+  enumerationTable.hasNext = [](const CMPIEnumeration* enumeration, CMPIStatus* status) {
+    auto* object = of<EnumerationObject>(enumeration);
+    const bool isThere = object->next < object->instances.size();
+    return object->owner->answer("hasNext", status, static_cast<CMPIBoolean>(isThere ? 1 : 0));
+  };
+  enumerationTable.getNext = [](const CMPIEnumeration* enumeration, CMPIStatus* status) {
+    auto* object = of<EnumerationObject>(enumeration);
+    CMPIData data{CMPI_instance, CMPI_goodValue, {}};
+    if (object->next == object->instances.size()) {
+      object->owner->answer("getNext", status, data);
+      set(status, CMPI_RC_ERR_NOT_FOUND);
+      return CMPIData{CMPI_null, CMPI_notFound, {}};
+    }
+    data.value.inst = object->instances[object->next++];
+    return object->owner->answer("getNext", status, data);
+  };
+}
+
 void FakeCmpi::fillPathTable() {
   pathTable.ftVersion = CMPICurrentVersion;
   pathTable.getNameSpace = [](const CMPIObjectPath* path, CMPIStatus* status) {
@@ -271,6 +316,10 @@ void FakeCmpi::fillObjectTables() {
     auto* object = of<InstanceObject>(instance);
     return object->owner->answer("getPropertyCount", status,
                                  static_cast<CMPICount>(object->properties.size()));
+  };
+  instanceTable.getObjectPath = [](const CMPIInstance* instance, CMPIStatus* status) {
+    auto* object = of<InstanceObject>(instance);
+    return object->owner->answer("getObjectPath", status, const_cast<CMPIObjectPath*>(object->path));
   };
   instanceTable.setProperty = [](const CMPIInstance* instance, const char* name, const CMPIValue* value,
                                  CMPIType type) {

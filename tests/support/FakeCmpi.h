@@ -9,6 +9,7 @@
 #include <cmpi/cmpift.h>
 
 #include <deque>
+#include <functional>
 #include <map>
 #include <optional>
 #include <string>
@@ -44,13 +45,19 @@ class FakeCmpi {
   static const std::string& nameSpaceOf(const CMPIObjectPath* path);
   static const std::string& classOf(const CMPIObjectPath* path);
 
+  /// Another provider behind the broker: fills in the instances of an enumeration, or gives its status.
+  using InstanceSource = std::function<CMPIrc(const CMPIObjectPath*, std::vector<CMPIInstance*>&)>;
+
   // What a test may alter.
+  CMPIBrokerFT upcalls;
   CMPIBrokerEncFT factory;
   CMPIStringFT stringTable;
   CMPIObjectPathFT pathTable;
   CMPIInstanceFT instanceTable;
   CMPIArrayFT arrayTable;
   CMPIDateTimeFT dateTimeTable;
+  CMPIEnumerationFT enumerationTable;
+  InstanceSource source;  ///< answers the broker's enumerateInstances; without it no class is known
   std::map<std::string, std::string> parentOf;  ///< the class schema: class to its parent
   bool caseMatters = false;                     ///< compare key and property names exactly
   bool findsNothingQuietly = false;             ///< a missing name gives status OK and the state "not found"
@@ -91,6 +98,12 @@ class FakeCmpi {
     FakeCmpi* owner;
     std::string text;
   };
+  struct EnumerationObject {
+    CMPIEnumeration handle;
+    FakeCmpi* owner;
+    std::vector<CMPIInstance*> instances;
+    std::size_t next;
+  };
 
   template <typename Object, typename Handle>
   static Object* of(const Handle* handle) {
@@ -106,6 +119,7 @@ class FakeCmpi {
   static void put(std::vector<Entry>& entries, const char* name, const CMPIData& data);
   CMPIInstance* newInstance(const CMPIObjectPath* path);
   void fillFactory();
+  void fillUpcalls();
   void fillPathTable();
   void fillObjectTables();
 
@@ -115,6 +129,7 @@ class FakeCmpi {
   std::deque<InstanceObject> instances_;
   std::deque<ArrayObject> arrays_;
   std::deque<DateTimeObject> dateTimes_;
+  std::deque<EnumerationObject> enumerations_;
 };
 
 }  // namespace tests

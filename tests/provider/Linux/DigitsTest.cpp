@@ -40,6 +40,16 @@ TEST(Digits, DecimalTextIsTheStandardLibrarys) {
       [](std::uint64_t number) { ASSERT_EQ(DecimalText(number).view(), std::to_string(number)); });
 }
 
+TEST(Digits, DecimalTextHasACharacterBehindItsDigits) {
+  DecimalText text(0);
+  forNumbersOfAllLengths([&text](std::uint64_t number) {
+    ASSERT_EQ(DecimalText(number, '@').view(), std::to_string(number) + "@");
+    text.set(number, '@');
+    ASSERT_EQ(text.view(), std::to_string(number) + "@") << "whatever it was before";
+  });
+  EXPECT_EQ(DecimalText(0, '@').view(), "0@");
+}
+
 TEST(Digits, EveryNumberBelow100000HasItsDecimalText) {
   for (std::uint64_t number = 0; number < 100000; ++number) {
     ASSERT_EQ(DecimalText(number).view(), std::to_string(number));
