@@ -167,6 +167,47 @@ TEST_F(AssociationOperations, ASourceOfAnotherClassYieldsNothingFromThreeAndOneN
   EXPECT_TRUE(names(nullptr, elementSoftware).isComplete());
 }
 
+TEST_F(AssociationOperations, AKnownClassReachesItsOwnAdapterWhateverItsAncestors) {
+  world.ancestors[bmcClass] = {elementSoftware, "CIM_InstalledSoftwareIdentity"};
+  EXPECT_THAT(names(software(bmc), bmcClass).objects, ElementsAre(serviceProcessorText("alpha")));
+  EXPECT_EQ(countOf(world.calls, "areClassesRelated"), 0U);
+}
+
+// ---- Exceptions that nobody expects.
+
+class AssociationDeathTest : public AssociationRequests {
+ protected:
+  /// Another exception than the framework's own comes out of this call, the first of its kind.
+  void throwFrom(const std::string& call, const CMPIObjectPath* source, const char* associationClass) {
+    world.fault = standin::Fault::Result;
+    failFirst(call, [&] { ask(source, associationClass); });
+    world.fault = standin::Fault::ThrowOther;
+    ask(source, associationClass);
+  }
+  void ask(const CMPIObjectPath* source, const char* associationClass) {
+    associations->ft->associatorNames(associations, nullptr, world.result(), source, associationClass,
+                                      nullptr, nullptr, nullptr);
+  }
+};
+
+TEST_F(AssociationDeathTest, EndTheProcessInTheInstalledAndTheNetworkResolver) {
+  testing::FLAGS_gtest_death_test_style = "threadsafe";
+  EXPECT_DEATH(throwFrom("selectNode(\"/f1\")", software(bios), installedClass), "terminate called");
+  EXPECT_DEATH(throwFrom("selectNode(12)", port("eth0"), networkClass), "terminate called");
+  EXPECT_DEATH(throwFrom("selectNode(\"/1a\")", software(nicFirmware), networkClass), "terminate called");
+  EXPECT_DEATH(throwFrom("selectNode(49)", path("KELVO_NetworkPort"), networkClass), "terminate called");
+}
+
+TEST_F(AssociationDeathTest, PassTheFirmwareResolversToTheLog) {
+  const std::string expected = "MESSAGE [File: SoftwareInventoryProvider.cpp, Line: N]: another failure";
+  throwFrom("selectNode(\"/f2\")", software(bmc), bmcClass);
+  EXPECT_THAT(logTexts(world, 3000), ElementsAre(expected));
+  EXPECT_EQ(world.done, 1);
+  throwFrom("getNodeDescription", computer("alpha"), biosClass);
+  EXPECT_THAT(logTexts(world, 3000), ElementsAre(expected));
+  EXPECT_EQ(world.done, 1);
+}
+
 // ---- What a request says of itself.
 
 std::vector<std::string> withoutAdapters(const standin::World& world) {
