@@ -83,28 +83,13 @@ cimom::PropertyList wanted(const Options& options) {
   return options.properties.empty() ? cimom::PropertyList() : options.properties;
 }
 
-cimom::Outcome ask(Session& session, const std::string& path, const Options& options, ClassWriter& writer,
-                   Progress& progress, const Output& output) {
-  const cimom::AssociationQuery query = queryOf(session, options);
-  const auto write = [&](const auto& object) {
-    progress.stop();
-    const SchemaClass& info = session.classNamed(std::string(object.className()));
-    writer.write(info, rowOf(object, writer.columnsOf(info)));
-    return output.error() == 0;
-  };
-  if (options.namesOnly) {
-    return session.manager().associatorNames(path, query, write);
-  }
-  return session.manager().associators(path, query, wanted(options), write);
-}
-
 /// Providers answer alike for an object that belongs to nothing and for one that is not there.
-void tellApart(Session& session, const std::string& path, cimom::Outcome& outcome) {
+void tellApart(const Session& session, const std::string& path, cimom::Outcome& outcome) {
   if (outcome.status.code == CMPI_RC_OK && outcome.delivered == 0) {
     const cimom::Outcome object = session.manager().getInstance(path, std::vector<std::string>{},
                                                                 [](const cimom::Instance&) { return true; });
     if (object.status.code == CMPI_RC_ERR_NOT_FOUND) {
-      outcome.status = object.status;
+      outcome = object;
     }
   }
 }
@@ -114,11 +99,20 @@ void tellApart(Session& session, const std::string& path, cimom::Outcome& outcom
 void runAssociators(const Options& options, Output& output) {
   Session session(options);
   const std::string what = "associators " + options.object;
+  const cimom::AssociationQuery query = queryOf(session, options);
   const auto classes = session.publishedClasses(classOrAny(session, options.resultClass));
   const auto writer = makeClassWriter(classes, options, output);
   Progress progress("Asking for what belongs to " + options.object);
   const NamedObject object = namedObject(session, options.object, what);
-  cimom::Outcome outcome = ask(session, object.path, options, *writer, progress, output);
+  const auto write = [&](const auto& each) {
+    progress.stop();
+    const SchemaClass& info = session.classNamed(std::string(each.className()));
+    writer->write(info, rowOf(each, writer->columnsOf(info)));
+    return output.error() == 0;
+  };
+  cimom::Outcome outcome = options.namesOnly
+                               ? session.manager().associatorNames(object.path, query, write)
+                               : session.manager().associators(object.path, query, wanted(options), write);
   tellApart(session, object.path, outcome);
   progress.stop();
   session.conclude(outcome, what, *writer, output);

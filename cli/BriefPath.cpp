@@ -1,5 +1,4 @@
 #include <cimom/Names.h>
-#include <cimom/broker/WbemUri.h>
 #include <cli/BriefPath.h>
 
 namespace cli {
@@ -52,8 +51,7 @@ const cimom::mof::Property* tellingKey(const cimom::SchemaClass& info) {
 std::string briefPath(const cimom::ObjectPath& path) {
   const std::string_view value = tellingValue(path);
   if (value.empty()) {
-    const std::string uri = cimom::formatWbemUri(path);
-    return uri.substr(uri.substr(0, uri.find('"')).rfind(':') + 1);  // 0 where there is no namespace
+    return {};
   }
   // A text with a "=" would be read as a path.
   if (cimom::sameName(path.className(), softwareClass) && value.find('=') == std::string_view::npos) {

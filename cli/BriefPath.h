@@ -25,7 +25,7 @@ bool namesASystem(std::string_view key);
 /// or several.
 const cimom::mof::Property* tellingKey(const cimom::SchemaClass& info);
 
-/// The short form of a path, or its WBEM URI without host and namespace where it has none.
+/// The short form of a path; empty where it has none.
 std::string briefPath(const cimom::ObjectPath& path);
 
 }  // namespace cli

@@ -31,6 +31,25 @@ TEST(JsonOutput, NothingIsWrittenBeforeTheFirstRow) {
   EXPECT_EQ(captured.text(), "");
 }
 
+TEST(JsonOutput, ColumnsMayChangeFromObjectToObject) {
+  cli_test::CapturedOutput captured;
+  cli::JsonOutput json({{"A"}}, captured.output());
+  json.write({Scalar(true)});
+  json.use({{"B"}, {"C"}});
+  json.write({Scalar(false), Scalar(std::string("x"))});
+  json.finish();
+  EXPECT_EQ(captured.text(), R"([
+  {
+    "A": true
+  },
+  {
+    "B": false,
+    "C": "x"
+  }
+]
+)");
+}
+
 TEST(JsonOutput, MembersHaveTheOrderOfTheColumnsAndNullsAreLeftOut) {
   const std::vector<cli::Row> rows{{Scalar(std::uint64_t{1}), Value(), Scalar(std::string("x"))},
                                    {Value(), Value(), Scalar(std::string())}};

@@ -52,6 +52,25 @@ TEST(Options, ArgumentsOfEachCommand) {
   EXPECT_EQ(parsed({"tree"}).command, Command::Tree);
 }
 
+TEST(Options, AssociatorsTakesWhatNarrowsIt) {
+  const cli::Options plain = parsed({"associators", "1@3b2"});
+  EXPECT_EQ(plain.command, Command::Associators);
+  EXPECT_EQ(plain.object, "1@3b2");
+  EXPECT_EQ(plain.associationClass + plain.resultClass + plain.role + plain.resultRole, "");
+  EXPECT_FALSE(plain.namesOnly);
+  const cli::Options narrowed =
+      parsed({"associators", "C=x", "--assoc-class", "A", "--result-class", "R", "--role", "From",
+              "--result-role", "To", "--names", "--format", "csv", "--provider", "p.so"});
+  EXPECT_EQ(narrowed.object, "C=x");
+  EXPECT_EQ(narrowed.associationClass, "A");
+  EXPECT_EQ(narrowed.resultClass, "R");
+  EXPECT_EQ(narrowed.role, "From");
+  EXPECT_EQ(narrowed.resultRole, "To");
+  EXPECT_TRUE(narrowed.namesOnly);
+  EXPECT_EQ(narrowed.format, Format::Csv);
+  EXPECT_THAT(parsed({"associators", "1@3b2", "--property", "A,B"}).properties, ElementsAre("A", "B"));
+}
+
 TEST(Options, AnArgumentMayBeNamedLikeACommand) {
   EXPECT_EQ(parsed({"capture", "tree"}).captureFile, "tree");
   EXPECT_EQ(parsed({"get", "list"}).object, "list");
@@ -92,6 +111,13 @@ TEST(Options, WhatMakesNoSenseIsAUsageError) {
   expectUsageError({"list", "A", "B"}, "'B' is one argument too many");
   expectUsageError({"get"}, "needs an InstanceID");
   expectUsageError({"capture"}, "needs a file");
+  expectUsageError({"associators"}, "'swinv associators' needs an InstanceID");
+  expectUsageError({"asociators", "1@3b2"}, "did you mean 'associators'?");
+  for (const char* option : {"--assoc-class", "--result-class", "--role", "--result-role"}) {
+    expectUsageError({"associators", "1@3b2", option, ""}, std::string(option) + " needs a name");
+    expectUsageError({"associators", "1@3b2", option}, option);
+  }
+  expectUsageError({"associators", "1@3b2", "--names", "--property", "X"}, "leave out --names or --property");
   expectUsageError({"list", "--format", "xml"}, "'xml' is none of table, json, csv");
   expectUsageError({"list", "--format"}, "--format");
   expectUsageError({"list", "--log-level", "loud"}, "'loud' is none of off, error, trace");
@@ -120,6 +146,11 @@ TEST(Options, AnOptionThatACommandDoesNotTakeIsAUsageError) {
   expectUsageError({"tree", "--format", "csv"}, "no csv form");
   expectUsageError({"capture", "f", "--format", "json"}, "'swinv capture' takes no --format");
   expectUsageError({"list", "--force"}, "'swinv list' takes no --force");
+  expectUsageError({"associators", "1@3b2", "--force"}, "'swinv associators' takes no --force");
+  expectUsageError({"get", "1@3b2", "--names"}, "'swinv get' takes no --names");
+  for (const char* option : {"--assoc-class", "--result-class", "--role", "--result-role"}) {
+    expectUsageError({"list", option, "X"}, std::string("'swinv list' takes no ") + option);
+  }
   expectUsageError({"list", "--inventory", "a", "--system-root", "b"}, "name two machines");
 }
 
@@ -180,6 +211,15 @@ TEST(Help, TheManualNamesEveryCommand) {
     EXPECT_THAT(manual(), HasSubstr("swinv " + std::string(cli::commandName(command))));
     EXPECT_THAT(std::string(cli::helpText(command)), HasSubstr("Example"));
   }
+}
+
+TEST(Help, TheNetworkAssociationIsToldOfByWhereItIsAsked) {
+  const std::string associators(cli::helpText(Command::Associators));
+  EXPECT_THAT(associators, HasSubstr("all firmware of its device"));
+  EXPECT_THAT(associators, HasSubstr("the first port of its device"));
+  EXPECT_THAT(associators, HasSubstr("shows the first network device alone"));
+  EXPECT_THAT(std::string(cli::helpText(Command::List)),
+              HasSubstr("the firmware of the first network device"));
 }
 
 TEST(Help, LinesFitATerminal) {

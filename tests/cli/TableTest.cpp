@@ -80,6 +80,15 @@ TEST(Table, NumbersAreShownByWhatTheyStandFor) {
   EXPECT_EQ(cli::cellText(Scalar(std::uint64_t{99}), column, Charset::Utf8), "99");
 }
 
+TEST(Table, ReferencesAreShownInShortWhereTheyHaveAShortForm) {
+  EXPECT_EQ(cli::cellText(Scalar(cli::Reference{"root/cimv2:C.K=\"a\"", "C=a"}), {"Ref"}, Charset::Utf8),
+            "C=a");
+  EXPECT_EQ(
+      cli::cellText(std::vector<Scalar>{cli::Reference{"n:C.K=\"a\"", "C=a"}, cli::Reference{"n:C.K=1"}},
+                    {"Refs"}, Charset::Utf8),
+      "C=a, C.K=1");
+}
+
 TEST(Table, ReferencesAreShownWithoutHostAndNamespace) {
   const cli::Column column{"Dependent"};
   EXPECT_EQ(
