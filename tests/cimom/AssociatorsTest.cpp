@@ -65,6 +65,8 @@ TEST_F(Associators, areNoneWhereNobodyIsRegistered) {
 TEST_F(Associators, areNotRepeatedByAnotherClass) {
   EXPECT_THAT(ends(server_, {.associationClass = "TEST_Holds"}),
               ElementsAre("TEST_Firmware f2", "TEST_Firmware f2", "TEST_Port kind", "TEST_Port more"));
+  EXPECT_THAT(ends(server_, {.associationClass = "TEST_Dependency"}),
+              ElementsAre("TEST_Firmware f2", "TEST_Firmware f2", "TEST_Port kind", "TEST_Port more"));
   const Answer all = associatorNames(server_);
   EXPECT_THAT(all.objects, testing::Contains("TEST_Firmware f2").Times(1));
   EXPECT_THAT(all.objects, testing::Contains("TEST_Port more").Times(1));
