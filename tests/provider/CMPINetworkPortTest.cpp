@@ -196,22 +196,26 @@ TEST_F(NetworkPortEnd, TracesItsLifeAsMethods) {
   EXPECT_EQ(world.log.front().category, "Corvane.SoftwareInventoryProvider");
 }
 
-TEST_F(NetworkPortEnd, TracesItsPathAndItsPropertiesAtTheRoutineLevel) {
+TEST_F(NetworkPortEnd, TracesThePathsTextAndItsPropertiesAtTheRoutineLevel) {
   world.log.clear();
-  open();
+  end.setObjectPath(port("B"));
   const char* properties[] = {"DeviceID", nullptr};
   end.getCMPIInstance(properties);
+  const std::string place = "() in CMPINetworkPort.cpp [Line: N]";
   std::ostringstream list;
-  list << "() in CMPINetworkPort.cpp [Line: N],Parameters List:  properties="
-       << static_cast<const void*>(properties);
+  list << place << ",Parameters List:  properties=" << static_cast<const void*>(properties);
   EXPECT_THAT(
       logTexts(world, 4000),
-      ElementsAre(
-          StartsWith(
-              "ENTERING: setObjectPath() in CMPINetworkPort.cpp [Line: N],Parameters List:  objectPath="),
-          StartsWith("EXITING: setObjectPath() in CMPINetworkPort.cpp [Line: N]"),
-          "ENTERING: getCMPIInstance" + list.str(), "EXITING: getCMPIInstance" + list.str()));
+      ElementsAre("ENTERING: setObjectPath" + place + ",Parameters List:  objectPath=" + portText("B"),
+                  StartsWith("EXITING: setObjectPath" + place), "ENTERING: getCMPIInstance" + list.str(),
+                  "EXITING: getCMPIInstance" + list.str()));
   EXPECT_THAT(logTexts(world, 3000), IsEmpty());
+}
+
+TEST_F(NetworkPortEnd, TracesANullPathCalmly) {
+  world.log.clear();
+  EXPECT_THROW(end.setObjectPath(nullptr), ProviderException);
+  EXPECT_THAT(logTexts(world, 4000).front(), testing::EndsWith(" objectPath=(null)"));
 }
 
 }  // namespace

@@ -34,15 +34,16 @@ const char* charPtr(const CMPIString* string, CMPIStatus*) {
   return static_cast<const char*>(string->hdl);
 }
 
-CMPIStringFT stringTable() {
+CMPIStringFT makeStringTable() {
   CMPIStringFT table{};
   table.ftVersion = CMPICurrentVersion;
   table.getCharPtr = charPtr;
   return table;
 }
 
+CMPIStringFT stringTable = makeStringTable();
+
 CMPIString* getClassName(const CMPIObjectPath* path, CMPIStatus* answer) {
-  static CMPIStringFT table = stringTable();
   static thread_local CMPIString string;
   const bool fails = world().record("getClassName", false);
   if (answer != nullptr) {
@@ -52,7 +53,20 @@ CMPIString* getClassName(const CMPIObjectPath* path, CMPIStatus* answer) {
     return nullptr;
   }
   string.hdl = static_cast<Path*>(path->hdl)->className.data();
-  string.ft = &table;
+  string.ft = &stringTable;
+  return &string;
+}
+
+// Asked for where a trace prints a path, and therefore no recorded call.
+CMPIString* toString(const CMPIObjectPath* path, CMPIStatus* answer) {
+  static thread_local std::string text;
+  static thread_local CMPIString string;
+  if (answer != nullptr) {
+    *answer = status(CMPI_RC_OK);
+  }
+  text = describe(static_cast<Path*>(path->hdl));
+  string.hdl = text.data();
+  string.ft = &stringTable;
   return &string;
 }
 
@@ -69,16 +83,16 @@ CMPIObjectPathFT makePathTable() {
   CMPIObjectPathFT table{};
   table.ftVersion = CMPICurrentVersion;
   table.getClassName = getClassName;
+  table.toString = toString;
   return table;
 }
 
 [[noreturn]] void throwFault(Fault fault) {
-  constexpr int number = 17;
   switch (fault) {
     case Fault::ThrowOther:
       throw std::runtime_error("another failure");
     case Fault::ThrowNumber:
-      throw number;  // NOLINT(hicpp-exception-baseclass): what the provider cannot know
+      throw int{1};  // NOLINT(hicpp-exception-baseclass): what the provider cannot know
     default:
       throw Oru::InstrumentationException("injected failure");
   }
