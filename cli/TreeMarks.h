@@ -16,6 +16,8 @@ bool isSoftware(int type);
 ///   is its BIOS                 firmware described "BIOS"
 ///   runs its service processor  firmware described "BMC Firmware"
 ///   serves port DEVICE          directly below a network device: the first port below that, if it has a name
+///   and
+///                               a computer with one
 ///
 /// Joined by commas; empty for a node that none of them reaches.
 std::string associationMark(const agent::NodeTree& tree, agent::NodeTree::Index node);

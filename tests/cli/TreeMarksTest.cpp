@@ -90,20 +90,27 @@ TEST_F(Marks, SoftwareBelowANetworkDeviceServesTheFirstPort) {
 }
 
 TEST_F(Marks, TheFirstPortMayLieDeeper) {
-  const Handle device = add(NodeTreeBuilder::noParent, lexicon::NetworkDeviceNode, "Network Device");
+  const Handle device = add(computer("atlas"), lexicon::NetworkDeviceNode, "Network Device");
   add(device, lexicon::FirmwareNode, "Network Firmware");
   const Handle module = add(device, 1000, "Module");
   add(module, lexicon::NetworkPortNode, "eth0", "module/1");
   add(device, lexicon::NetworkPortNode, "eth1", "card/1");
-  EXPECT_EQ(markOf(2), "serves port module/1");
+  EXPECT_EQ(markOf(3), "on atlas, serves port module/1");
 }
 
 TEST_F(Marks, FirmwareThatLiesDeeperServesNone) {
-  const Handle device = add(NodeTreeBuilder::noParent, lexicon::NetworkDeviceNode, "Network Device");
+  const Handle device = add(computer("atlas"), lexicon::NetworkDeviceNode, "Network Device");
   add(device, lexicon::NetworkPortNode, "eth0", "card/1");
   const Handle module = add(device, 1000, "Module");
   add(module, lexicon::FirmwareNode, "Network Firmware");
-  EXPECT_EQ(markOf(4), "");
+  EXPECT_EQ(markOf(5), "on atlas");
+}
+
+TEST_F(Marks, APortOnNoComputerThatHasANameIsServedByNone) {
+  const Handle device = add(NodeTreeBuilder::noParent, lexicon::NetworkDeviceNode, "Network Device");
+  add(device, lexicon::FirmwareNode, "Network Firmware");
+  add(device, lexicon::NetworkPortNode, "eth0", "card/1");
+  EXPECT_EQ(markOf(2), "");
 }
 
 TEST_F(Marks, ADeviceWithoutPortsOrWhoseFirstPortHasNoNameIsServedByNone) {

@@ -43,7 +43,7 @@ TEST(TreePrinter, DrawsBranchesAndIdentifiers) {
             "ComputerSystem alpha  [1]\n"
             "├─ Firmware BIOS, version 2.4.1  [1@2a]\n"
             "├─ NetworkDevice Ethernet X  [26]\n"
-            "│  ├─ Firmware Boot code (Mörk); serves port 0000:01:00.0/0  [26@abc]\n"
+            "│  ├─ Firmware Boot code (Mörk)  [26@abc]\n"
             "│  └─ NetworkPort eth0 (0000:01:00.0/0)  [27]\n"
             "└─ Driver ixgbe, version 5.1.0, drives pci:0000:01:00.0  [1@d]\n");
 }
@@ -53,7 +53,7 @@ TEST(TreePrinter, DrawsInAsciiWhereThatIsAll) {
             "ComputerSystem alpha  [1]\n"
             "|- Firmware BIOS, version 2.4.1  [1@2a]\n"
             "|- NetworkDevice Ethernet X  [26]\n"
-            "|  |- Firmware Boot code (M?rk); serves port 0000:01:00.0/0  [26@abc]\n"
+            "|  |- Firmware Boot code (M?rk)  [26@abc]\n"
             "|  `- NetworkPort eth0 (0000:01:00.0/0)  [27]\n"
             "`- Driver ixgbe, version 5.1.0, drives pci:0000:01:00.0  [1@d]\n");
 }
