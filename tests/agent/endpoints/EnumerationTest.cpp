@@ -10,11 +10,11 @@ using testing::HasSubstr;
 using testing::IsEmpty;
 using Endpoints = Requests;
 
-std::string system(const std::string& className, const std::string& name) {
+std::string systemPath(const std::string& className, const std::string& name) {
   return "root/cimv2:" + className + ".CreationClassName=" + className + ",Name=" + name;
 }
 
-std::string port(const std::string& computer, const std::string& device) {
+std::string portPath(const std::string& computer, const std::string& device) {
   return "root/cimv2:KELVO_NetworkPort.SystemCreationClassName=KELVO_ComputerSystem,SystemName=" + computer +
          ",CreationClassName=KELVO_NetworkPort,DeviceID=" + device;
 }
@@ -23,8 +23,8 @@ TEST_F(Endpoints, ComputersAreTheNamedOnesOfTheTreeInItsOrder) {
   const Answer answer = enumerateNames(computers);
   EXPECT_EQ(answer.status, CMPI_RC_OK);
   EXPECT_EQ(answer.done, 1);
-  EXPECT_THAT(answer.paths, ElementsAre(system(computers, "atlas"), system(computers, "boreas"),
-                                        system(computers, "blade")))
+  EXPECT_THAT(answer.paths, ElementsAre(systemPath(computers, "atlas"), systemPath(computers, "boreas"),
+                                        systemPath(computers, "blade")))
       << "of two with a name, the first; a nameless one cannot be told";
 }
 
@@ -32,7 +32,7 @@ TEST_F(Endpoints, ControllersAreWhereTheirFirmwareIsAndBearTheNameOfTheComputerA
   const Answer answer = enumerateNames(controllers);
   EXPECT_EQ(answer.status, CMPI_RC_OK);
   EXPECT_EQ(answer.done, 1);
-  EXPECT_THAT(answer.paths, ElementsAre(system(controllers, "atlas"), system(controllers, "blade")))
+  EXPECT_THAT(answer.paths, ElementsAre(systemPath(controllers, "atlas"), systemPath(controllers, "blade")))
       << "two images of firmware make one controller; the description is compared with case";
 }
 
@@ -40,9 +40,10 @@ TEST_F(Endpoints, PortsAreTheNamedOnesOfNamedComputersInTheOrderOfTheWalk) {
   const Answer answer = enumerateNames(ports);
   EXPECT_EQ(answer.status, CMPI_RC_OK);
   EXPECT_EQ(answer.done, 1);
-  EXPECT_THAT(answer.paths, ElementsAre(port("atlas", "0000:02:00.0/1"), port("atlas", "0000:02:00.0/2"),
-                                        port("atlas", "usb:1-4:1.0/1"), port("atlas", "0000:3b:00.0/1"),
-                                        port("boreas", "0000:02:00.0/1")));
+  EXPECT_THAT(answer.paths,
+              ElementsAre(portPath("atlas", "0000:02:00.0/1"), portPath("atlas", "0000:02:00.0/2"),
+                          portPath("atlas", "usb:1-4:1.0/1"), portPath("atlas", "0000:3b:00.0/1"),
+                          portPath("boreas", "0000:02:00.0/1")));
 }
 
 TEST_F(Endpoints, WhatIsLeftOutIsLogged) {
@@ -123,23 +124,23 @@ TEST_F(Endpoints, PropertyListLeavesOutTheOthersButNoKey) {
 
 TEST_F(Endpoints, DeviceIdAloneNarrowsToThePortsThatHaveIt) {
   EXPECT_THAT(enumerateNames(ports, {{"DeviceID", "usb:1-4:1.0/1"}}).paths,
-              ElementsAre(port("atlas", "usb:1-4:1.0/1")));
+              ElementsAre(portPath("atlas", "usb:1-4:1.0/1")));
   EXPECT_THAT(enumerateNames(ports, {{"DeviceID", "0000:02:00.0/1"}}).paths,
-              ElementsAre(port("atlas", "0000:02:00.0/1"), port("boreas", "0000:02:00.0/1")));
+              ElementsAre(portPath("atlas", "0000:02:00.0/1"), portPath("boreas", "0000:02:00.0/1")));
   EXPECT_EQ(enumerate(ports, {{"DeviceID", "0000:3b:00.0/1"}}).property(0, "ElementName"), "ib0");
 }
 
 TEST_F(Endpoints, EachKeyNarrows) {
   EXPECT_THAT(enumerateNames(ports, {{"SystemName", "boreas"}}).paths,
-              ElementsAre(port("boreas", "0000:02:00.0/1")));
+              ElementsAre(portPath("boreas", "0000:02:00.0/1")));
   EXPECT_EQ(enumerateNames(ports, {{"CreationClassName", "KELVO_NetworkPort"}}).paths.size(), 5U);
   EXPECT_EQ(enumerateNames(ports, {{"SystemCreationClassName", "KELVO_ComputerSystem"}}).paths.size(), 5U);
   EXPECT_THAT(enumerateNames(ports, {{"SystemCreationClassName", "KELVO_SPComputerSystem"}}).paths,
               IsEmpty());
   EXPECT_THAT(enumerateNames(computers, {{"Name", "boreas"}}).paths,
-              ElementsAre(system(computers, "boreas")));
+              ElementsAre(systemPath(computers, "boreas")));
   EXPECT_THAT(enumerateNames(controllers, {{"Name", "blade"}}).paths,
-              ElementsAre(system(controllers, "blade")));
+              ElementsAre(systemPath(controllers, "blade")));
   EXPECT_THAT(enumerateNames(controllers, {{"Name", "boreas"}}).paths, IsEmpty()) << "it has no controller";
   EXPECT_THAT(
       enumerateNames(computers, {{"Name", "atlas"}, {"CreationClassName", "KELVO_SPComputerSystem"}}).paths,
@@ -158,9 +159,10 @@ TEST_F(Endpoints, ValuesAreComparedExactlyAndKeyNamesAsCimDoes) {
   EXPECT_THAT(enumerateNames(computers, {{"Name", "atlas "}}).paths, IsEmpty());
   EXPECT_THAT(enumerateNames(computers, {{"Name", ""}}).paths, IsEmpty());
   EXPECT_THAT(enumerateNames(computers, {{"CreationClassName", "kelvo_computersystem"}}).paths, IsEmpty());
-  EXPECT_THAT(enumerateNames(computers, {{"NAME", "atlas"}}).paths, ElementsAre(system(computers, "atlas")));
+  EXPECT_THAT(enumerateNames(computers, {{"NAME", "atlas"}}).paths,
+              ElementsAre(systemPath(computers, "atlas")));
   EXPECT_THAT(enumerateNames(computers, {{"Name", "boreas"}, {"name", "atlas"}}).paths,
-              ElementsAre(system(computers, "boreas")))
+              ElementsAre(systemPath(computers, "boreas")))
       << "of two keys of a name the first stands";
 }
 
