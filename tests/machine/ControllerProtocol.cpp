@@ -9,8 +9,9 @@ namespace machine {
 namespace {
 
 constexpr std::uint8_t EndOfMessage = 0xa0;
-constexpr std::uint8_t EndOfCommand = 0xa1;  // a command to the emulation itself, such as the version of this protocol
-constexpr std::uint8_t Escape = 0xaa;        // the next byte is one of these three, with EscapeBit set
+constexpr std::uint8_t EndOfCommand =
+    0xa1;  // a command to the emulation itself, such as the version of this protocol
+constexpr std::uint8_t Escape = 0xaa;  // the next byte is one of these three, with EscapeBit set
 constexpr std::uint8_t EscapeBit = 0x10;
 
 constexpr std::size_t HeaderSize = 3;
@@ -20,8 +21,8 @@ std::uint8_t sumOf(const Message& bytes) {
 }
 
 Message withCompletion(const Message& request, std::uint8_t code) {
-  constexpr std::uint8_t ResponseBit = 0x04;  // the lowest bit of the function
-  return {request.at(0), static_cast<std::uint8_t>(request.at(1) | ResponseBit), request.at(2), code};
+  constexpr std::uint8_t responseBit = 0x04;  // the lowest bit of the function
+  return {request.at(0), static_cast<std::uint8_t>(request.at(1) | responseBit), request.at(2), code};
 }
 
 }  // namespace
@@ -63,27 +64,28 @@ std::vector<std::uint8_t> framed(const Message& message) {
 }
 
 Message answerTo(const Message& request) {
-  constexpr std::uint8_t Application = 0x06;
-  constexpr std::uint8_t GetDeviceId = 0x01;
-  constexpr std::uint8_t Completed = 0x00;
-  constexpr std::uint8_t NoSuchCommand = 0xc1;
-  if (request.at(1) >> 2 != Application || request.at(2) != GetDeviceId) {
-    return withCompletion(request, NoSuchCommand);
+  constexpr std::uint8_t application = 0x06;
+  constexpr std::uint8_t getDeviceId = 0x01;
+  constexpr std::uint8_t completed = 0x00;
+  constexpr std::uint8_t noSuchCommand = 0xc1;
+  if (request.at(1) >> 2 != application || request.at(2) != getDeviceId) {
+    return withCompletion(request, noSuchCommand);
   }
-  // Device id and revision; firmware 7.31, the second part in BCD; the version of the standard, 2.0; a sensor device;
-  // maker and product; the auxiliary revision.
-  constexpr std::array<std::uint8_t, 15> Device{0x20, 0x01, 0x07, 0x31, 0x02, 0x01, 0x57, 0x01,
+  // Device id and revision; firmware 7.31, the second part in BCD; the version of the standard, 2.0; a sensor
+  // device; maker and product; the auxiliary revision.
+  constexpr std::array<std::uint8_t, 15> device{0x20, 0x01, 0x07, 0x31, 0x02, 0x01, 0x57, 0x01,
                                                 0x00, 0x31, 0x00, 0x01, 0xa0, 0x0c, 0x00};
-  Message answer = withCompletion(request, Completed);
-  answer.insert(answer.end(), Device.begin(), Device.end());
+  Message answer = withCompletion(request, completed);
+  answer.insert(answer.end(), device.begin(), device.end());
   return answer;
 }
 
-Message shortAnswerTo(const Message& request) {
+Message oddAnswerTo(const Message& request) {
+  constexpr std::size_t revision = 6;
   Message answer = answerTo(request);
-  constexpr std::size_t ShortSize = 7;
-  if (answer.size() > ShortSize) {
-    answer.resize(ShortSize);
+  if (answer.size() > revision + 1) {
+    answer[revision] |= 0x80U;
+    answer[revision + 1] = 0x1f;
   }
   return answer;
 }

@@ -2,8 +2,9 @@
 //
 //   machine_controller SOCKET FILE
 //
-// It listens on the unix socket SOCKET. Before each answer it reads the first word of FILE: "late" (the answer comes two
-// seconds later), "silent" (there is none), "short" (most of it is missing); anything else, or no file: all is well.
+// It listens on the unix socket SOCKET. Before each answer it reads the first word of FILE: "late" (the
+// answer comes a second later), "silent" (there is none), "odd" (a revision that is no number); anything
+// else, or no file: all is well.
 
 #include "ControllerProtocol.h"
 
@@ -33,10 +34,10 @@ void reply(int peer, const machine::Message& request, const std::string& behavio
     return;
   }
   if (behaviour == "late") {
-    std::this_thread::sleep_for(std::chrono::seconds(2));
+    std::this_thread::sleep_for(std::chrono::seconds(1));
   }
   const auto bytes =
-      machine::framed(behaviour == "short" ? machine::shortAnswerTo(request) : machine::answerTo(request));
+      machine::framed(behaviour == "odd" ? machine::oddAnswerTo(request) : machine::answerTo(request));
   if (::send(peer, bytes.data(), bytes.size(), MSG_NOSIGNAL) != static_cast<ssize_t>(bytes.size())) {
     std::perror("send");
   }
@@ -54,7 +55,8 @@ void serve(int peer, const std::string& file) {
     for (ssize_t i = 0; i < size; ++i) {
       if (const auto request = reader.take(buffer.at(static_cast<std::size_t>(i)))) {
         const std::string now = behaviour(file);
-        std::cout << "function " << (request->at(1) >> 2) << " command " << int{request->at(2)} << ' ' << now << std::endl;
+        std::cout << "function " << (request->at(1) >> 2) << " command " << int{request->at(2)} << ' ' << now
+                  << std::endl;
         reply(peer, *request, now);
       }
     }
