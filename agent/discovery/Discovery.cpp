@@ -1,9 +1,17 @@
 #include <agent/discovery/Discovery.h>
+#include <agent/discovery/Merge.h>
 #include <agent/discovery/SourceRunner.h>
 #include <agent/discovery/dmi/DmiSource.h>
 #include <agent/discovery/drivers/DriverSource.h>
+#include <agent/discovery/engine/EngineSource.h>
+#include <agent/discovery/esrt/EsrtSource.h>
+#include <agent/discovery/gpu/GpuSource.h>
 #include <agent/discovery/host/HostSource.h>
+#include <agent/discovery/ipmi/IpmiSource.h>
 #include <agent/discovery/network/NetworkSource.h>
+#include <agent/discovery/processor/ProcessorSource.h>
+#include <agent/discovery/storage/StorageSource.h>
+#include <agent/discovery/tpm/TpmSource.h>
 #include <agent/framework/OwnNumbers.h>
 
 #include <Oru/NodeLexicon.h>
@@ -26,10 +34,21 @@ std::vector<Source> makeSources(const DiscoveryOptions& options, const SystemRoo
   if (ethtool == nullptr && root.isLive()) {
     ethtool = discovery::makeKernelEthtool();
   }
+  discovery::IpmiOpener ipmi = options.ipmi;
+  if (!ipmi && root.isLive()) {
+    ipmi = discovery::kernelIpmi();
+  }
   return {
       {"host", discovery::readHost},
       {"dmi", discovery::readDmi},
+      {"ipmi", [ipmi](SourceContext& context) { discovery::readIpmi(context, ipmi); }},
+      {"esrt", discovery::readEsrt},
+      {"processor", discovery::readProcessor},
+      {"tpm", discovery::readTpm},
+      {"engine", discovery::readEngine},
       {"network", [ethtool](SourceContext& context) { discovery::readNetwork(context, ethtool); }},
+      {"storage", discovery::readStorage},
+      {"gpu", discovery::readGpu},
       {"drivers",
        [modules = options.modules](SourceContext& context) { discovery::readDrivers(context, modules); }},
   };
@@ -52,7 +71,7 @@ void addNode(NodeTreeBuilder& builder, NodeTreeBuilder::Handle parent, const Fou
 
 NodeTree discover(const DiscoveryOptions& options) {
   const SystemRoot root(options.root);
-  const std::vector<SourceResult> results =
+  std::vector<SourceResult> results =
       discovery::runSources(makeSources(options, root), root, options.deadline);
 
   NodeTreeBuilder builder;
@@ -66,12 +85,12 @@ NodeTree discover(const DiscoveryOptions& options) {
     if (result.computerName) {
       builder.setText(computer, Oru::NodeLexicon::NameProperty, *result.computerName);
     }
-    for (const FoundNode& node : result.nodes) {
-      addNode(builder, computer, node);
-    }
     for (const SourceReport& report : result.reports) {
       builder.addReport(report);
     }
+  }
+  for (const FoundNode& node : discovery::mergeResults(results)) {
+    addNode(builder, computer, node);
   }
   return builder.build();
 }

@@ -1,10 +1,12 @@
 // Discovery: the machine below a system root, read into a node tree.
 //
-// Each source (host, dmi, network, drivers) is a folder of its own and runs on a thread of its own. A source
-// that does not end in time is reported and left behind: what it still does touches nothing that others see.
+// Each source (host, dmi, ipmi, network, drivers and others) is a folder of its own and runs on a thread of
+// its own. A source that does not end in time is reported and left behind: what it still does touches nothing
+// that others see.
 #pragma once
 
 #include <agent/discovery/drivers/ModuleDatabase.h>
+#include <agent/discovery/ipmi/IpmiChannel.h>
 #include <agent/discovery/network/Ethtool.h>
 #include <agent/framework/NodeTree.h>
 
@@ -24,6 +26,9 @@ struct DiscoveryOptions {
 
   /// Null: the running kernel's where the root is "/", else none.
   std::shared_ptr<discovery::Ethtool> ethtool;
+
+  /// Empty: the running kernel's where the root is "/", else none.
+  discovery::IpmiOpener ipmi;
 
   /// Null: libkmod over root/lib/modules/RELEASE.
   std::shared_ptr<discovery::ModuleDatabase> modules;

@@ -26,6 +26,8 @@ struct FoundNode {
   std::vector<std::pair<int, std::string>> texts;      ///< text properties
   std::vector<std::pair<int, std::uint32_t>> numbers;  ///< number properties
   std::vector<FoundNode> children;
+  /// Of firmware: other texts that its version goes by, where a table may declare it under one of them.
+  std::vector<std::string> otherVersions = {};
 
   /// Sets a text property; absent is absent.
   void setText(int property, const std::optional<std::string>& text) {
@@ -36,10 +38,21 @@ struct FoundNode {
   void setValue(int property, std::uint32_t number) { numbers.emplace_back(property, number); }
 };
 
+/// Firmware that a table of the machine lists, and that a source may have found as well (`Merge.h`).
+struct DeclaredFirmware {
+  int list = 0;      ///< which of the table's lists it stands on; two entries of one list are two elements
+  FoundNode node;    ///< as it stands in the tree where no source found it
+  std::string kind;  ///< the description that a source would give it; empty where the table does not tell
+  /// What it belongs to; none: the computer, or nobody knows. A device that was found at the same position
+  /// takes its place.
+  std::optional<FoundNode> device;
+};
+
 /// All that one source found.
 struct SourceResult {
   std::optional<std::string> computerName;
   std::vector<FoundNode> nodes;  ///< what stands directly below the computer, in order
+  std::vector<DeclaredFirmware> declared;
   std::vector<SourceReport> reports;
 };
 
@@ -63,6 +76,9 @@ class SourceContext {
   std::optional<std::string> textIfAny(const std::string& path);
   /// The names in a folder; empty where it cannot be read, which is reported.
   std::vector<std::string> list(const std::string& path);
+  /// The same, except that it is no matter for a report where there is no such folder: for what many machines
+  /// lack.
+  std::vector<std::string> listIfAny(const std::string& path);
 
   /// Says what the source does next, for the report should that never end.
   void doing(const std::string& what);

@@ -70,6 +70,18 @@ std::vector<std::string> SourceContext::list(const std::string& path) {
   return std::move(*names.value);
 }
 
+std::vector<std::string> SourceContext::listIfAny(const std::string& path) {
+  doing(root_.outside(path));
+  Outcome<std::vector<std::string>> names = root_.list(path);
+  if (names) {
+    return std::move(*names.value);
+  }
+  if (reasonOf(names.error) != SourceReport::Reason::Absent) {
+    reportError(root_.outside(path), names.error);
+  }
+  return {};
+}
+
 void SourceContext::doing(const std::string& what) {
   board_->doing(what);
 }

@@ -56,6 +56,11 @@ std::optional<std::uint32_t> parseNumber(std::string_view text, std::uint32_t li
   return number;
 }
 
+bool isZeroVersion(std::string_view text) {
+  return text.find('0') != std::string_view::npos &&
+         text.find_first_not_of("0.:x- ") == std::string_view::npos;
+}
+
 std::string joinNames(const std::vector<std::string>& names, std::size_t limit) {
   std::string joined;
   for (std::size_t i = 0; i < names.size(); ++i) {

@@ -18,6 +18,10 @@ std::optional<std::string> meaningful(std::string_view text);
 /// none or is above `limit`.
 std::optional<std::uint32_t> parseNumber(std::string_view text, std::uint32_t limit = 0xffffffff);
 
+/// Whether a version is nothing but zeros and what stands between them: "00.00.00.00", "0x0", "0.0". Drivers
+/// show that for a version that they never got.
+bool isZeroVersion(std::string_view text);
+
 /// Names in a list for people, separated by ", ". From `limit` bytes on the rest is counted: "a, b and 3
 /// more". The first name always stands.
 std::string joinNames(const std::vector<std::string>& names, std::size_t limit);

@@ -26,7 +26,7 @@ constexpr std::array<Name, 8> nodeTypes{{
     {DeviceNode, "Device"},
 }};
 
-constexpr std::array<Name, 15> properties{{
+constexpr std::array<Name, 20> properties{{
     {Oru::NodeLexicon::ManufacturerProperty, "Manufacturer"},
     {Oru::NodeLexicon::MajorVersionProperty, "MajorVersion"},
     {Oru::NodeLexicon::MinorVersionProperty, "MinorVersion"},
@@ -42,6 +42,11 @@ constexpr std::array<Name, 15> properties{{
     {LinkTechnologyProperty, "LinkTechnology"},
     {SpeedProperty, "Speed"},
     {StateProperty, "State"},
+    {FirmwareIdProperty, "FirmwareId"},
+    {LowestVersionProperty, "LowestVersion"},
+    {ImageSizeProperty, "ImageSize"},
+    {UpdateProperty, "Update"},
+    {LastAttemptProperty, "LastAttempt"},
 }};
 
 std::optional<std::string_view> nameIn(std::span<const Name> names, int number) {

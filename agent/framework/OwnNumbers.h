@@ -17,7 +17,14 @@ enum OwnProperty : int {
   PermanentAddressProperty,  ///< of a port: the address its hardware came with, "02:00:5e:10:00:01"
   LinkTechnologyProperty,  ///< of a port: "Ethernet" and the other words of CIM's LinkTechnology, or another
   SpeedProperty,           ///< of a port: the speed of its link as it is now, in Mbit/s (a number)
-  StateProperty,           ///< of a computer or a port: "up", "down" (no link), "disabled" or "testing"
+  StateProperty,  ///< of a computer or a port: "up", "down" (no link), "disabled" or "testing"; of declared
+                  ///< firmware: "enabled", "disabled", "standby", "spare", "unavailable" or "other"
+  FirmwareIdProperty,     ///< of firmware: the id that it is updated by, often a GUID
+  LowestVersionProperty,  ///< of firmware: the lowest version that it may be replaced by
+  ImageSizeProperty,      ///< of firmware: the size of its image in bytes (a number)
+  UpdateProperty,       ///< of firmware: "updatable" or "not updatable", then ", write-protected" where it is
+  LastAttemptProperty,  ///< of firmware: the version of the last attempt to update it, and how that went:
+                        ///< "0x00020001: success"
 };
 
 }  // namespace agent

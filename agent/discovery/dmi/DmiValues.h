@@ -13,7 +13,17 @@ namespace agent::discovery {
 /// the calendar.
 std::optional<std::string> parseBiosDate(std::string_view text);
 
-struct BiosRelease {
+/// "MM/DD/YYYY" of a date as declared firmware has it: in SMBIOS form, or year, month and day as ISO 8601 has
+/// them ("2021-05-15", "20210515"), alone or with a time of the day behind it ("2021-05-15T00:00:00Z"). The
+/// day stays the one that is written, whatever the time zone. Nothing where the text has another form or
+/// names no day of the calendar.
+std::optional<std::string> parseFirmwareDate(std::string_view text);
+
+/// Whether a text is nothing but zeros and what stands between them, the way to write that nobody set it:
+/// "00000000-0000-0000-0000-000000000000", "0000-00-00T00:00:00Z".
+bool isUnset(std::string_view text);
+
+struct ReleaseNumbers {
   std::uint32_t major = 0;
   std::uint32_t minor = 0;
 
@@ -22,6 +32,9 @@ struct BiosRelease {
 };
 
 /// "5.17"; each part is one byte.
-std::optional<BiosRelease> parseBiosRelease(std::string_view text);
+std::optional<ReleaseNumbers> parseBiosRelease(std::string_view text);
+
+/// "60020.6"; each part is a number of any size that has 32 bits.
+std::optional<ReleaseNumbers> parseMajorMinor(std::string_view text);
 
 }  // namespace agent::discovery

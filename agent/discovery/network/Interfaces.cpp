@@ -1,3 +1,4 @@
+#include <agent/discovery/BusAddress.h>
 #include <agent/discovery/Values.h>
 #include <agent/discovery/network/Interfaces.h>
 
@@ -12,40 +13,6 @@ namespace {
 
 constexpr std::uint32_t highestPort = 0xffff;
 constexpr std::uint32_t highestIndex = 0x7fffffff;
-constexpr int deepestDevice = 64;
-
-bool isHexadecimal(std::string_view text) {
-  return text.find_first_not_of("0123456789abcdef") == std::string_view::npos;
-}
-
-/// "BUS:ADDRESS" of the device in `folder`, where it is a function of a bus; nothing where it is a part of
-/// one: a virtio or auxiliary device stands for (a share of) the function above it, and its own number comes
-/// from the order in which drivers were bound.
-std::optional<std::string> addressIn(const SourceContext& context, const std::string& folder) {
-  const std::string name(lastName(folder));
-  const Outcome<std::string> subsystem = context.root().linkTarget(within(folder, "subsystem"));
-  if (!subsystem) {
-    return isPciAddress(name) ? std::optional(name) : std::nullopt;
-  }
-  const std::string bus(lastName(*subsystem.value));
-  const bool isClass = lastName(parentFolder(*subsystem.value)) != "bus";
-  if (isClass || bus == "virtio" || bus == "auxiliary") {
-    return std::nullopt;
-  }
-  return bus == "pci" ? name : bus + ":" + name;
-}
-
-/// The address of the nearest function of a bus at or above `device`.
-std::string functionAddress(const SourceContext& context, const std::string& device) {
-  std::string folder = device;
-  for (int depth = 0; depth < deepestDevice && !folder.empty(); ++depth) {
-    if (std::optional<std::string> address = addressIn(context, folder)) {
-      return *address;
-    }
-    folder = parentFolder(folder);
-  }
-  return "device:" + std::string(lastName(device));
-}
 
 std::optional<std::uint32_t> numberIfAny(SourceContext& context, const std::string& path,
                                          std::uint32_t limit) {
@@ -129,18 +96,6 @@ std::vector<std::string> sortAndIdentify(const std::string& address,
 std::uint32_t portNumber(std::optional<std::uint32_t> devPort, std::optional<std::uint32_t> devId) {
   const std::uint32_t port = devPort.value_or(0);
   return 1 + (port != 0 ? port : devId.value_or(0));
-}
-
-bool isPciAddress(std::string_view text) {
-  // DDDD:BB:SS.F; domains of virtual bridges have more digits.
-  const std::size_t domain = text.find(':');
-  if (domain == std::string_view::npos || domain < 4 || domain > 8 ||
-      !isHexadecimal(text.substr(0, domain))) {
-    return false;
-  }
-  const std::string_view rest = text.substr(domain + 1);
-  return rest.size() == 7 && rest[2] == ':' && rest[5] == '.' && isHexadecimal(rest.substr(0, 2)) &&
-         isHexadecimal(rest.substr(3, 2)) && rest[6] >= '0' && rest[6] <= '7';
 }
 
 }  // namespace agent::discovery

@@ -45,7 +45,4 @@ std::vector<std::string> sortAndIdentify(const std::string& address,
 /// `dev_id`.
 std::uint32_t portNumber(std::optional<std::uint32_t> devPort, std::optional<std::uint32_t> devId);
 
-/// Whether `text` has the form of a PCI address with its domain.
-bool isPciAddress(std::string_view text);
-
 }  // namespace agent::discovery

@@ -49,6 +49,43 @@ TEST(BiosReleaseText, OtherFormsAreNone) {
   }
 }
 
+TEST(FirmwareDate, OfSmbiosAndOfIso8601BecomesMonthDayYear) {
+  EXPECT_EQ(parseFirmwareDate("3/9/2023"), "03/09/2023");
+  EXPECT_EQ(parseFirmwareDate("3/9/99"), "03/09/1999");
+  for (const char* text : {"2021-05-15", "20210515", "2021-05-15T00:00:00Z", "2021-05-15T23:59:59.5+08:00",
+                           "2021-05-15 12:00", "20210515T120000Z", "2021-05-15t01z"}) {
+    EXPECT_EQ(parseFirmwareDate(text), "05/15/2021") << text;
+  }
+}
+
+TEST(FirmwareDate, OtherFormsAndDaysOfNoCalendarAreNone) {
+  for (const char* text : {"", "2021", "2021-05", "2021-5-15", "2021-02-29", "2021-13-01", "0000-00-00",
+                           "2021051", "2021-05-15T", "2021-05-15Tz", "2021-05-15 noon", "2021-05-15x",
+                           "15-05-2021", "2021/05/15", "2021-0515", "+021-05-15", "20210515-1"}) {
+    EXPECT_EQ(parseFirmwareDate(text), std::nullopt) << text;
+  }
+}
+
+TEST(MajorMinor, IsTwoNumbersOf32Bits) {
+  const auto numbers = parseMajorMinor("60020.6");
+  ASSERT_TRUE(numbers);
+  EXPECT_EQ(numbers->major, 60020U);
+  EXPECT_EQ(numbers->minor, 6U);
+  EXPECT_EQ(parseMajorMinor("4294967295.0")->major, 0xffffffffU);
+  for (const char* text :
+       {"", "1", "1.", ".1", "1.2.3", "v1.2", "1.2a", "4294967296.0", "99999999999.0", "0x1.2"}) {
+    EXPECT_FALSE(parseMajorMinor(text)) << text;
+  }
+}
+
+TEST(UnsetText, IsZerosAndWhatStandsBetween) {
+  EXPECT_TRUE(isUnset("00000000-0000-0000-0000-000000000000"));
+  EXPECT_TRUE(isUnset("0000-00-00T00:00:00Z"));
+  EXPECT_FALSE(isUnset("00000000-0000-0000-0000-000000000001"));
+  EXPECT_FALSE(isUnset("-"));
+  EXPECT_FALSE(isUnset(""));
+}
+
 constexpr const char* folder = "sys/class/dmi/id/";
 
 TEST(DmiSource, WhatOnlyStandsInForAValueIsAbsentAndReported) {
@@ -86,6 +123,23 @@ TEST(DmiSource, MissingAttributesAreReportedOneByOne) {
 
 TEST(DmiSource, WithNoValueAtAllThereIsNoFirmware) {
   const Machine machine("sys/class/dmi/id/bios_version = Not Specified");
+  EXPECT_EQ(shown(discoverAt(machine)), "40 Computer System\n");
+}
+
+TEST(DmiSource, WithoutTablesTheAttributesTellOfTheEmbeddedControllerToo) {
+  const Machine machine("sys/class/dmi/id/ec_firmware_release = 1.32");
+  const NodeTree tree = discoverAt(machine);
+  EXPECT_EQ(shown(tree),
+            "40 Computer System\n"
+            "  1000 Embedded Controller\n"
+            "    3 Embedded Controller Firmware 104=1 107=32 307=\"1.32\"\n");
+  const auto report = reportOn(tree, "dmi", "sys/firmware/dmi/tables");
+  ASSERT_TRUE(report);
+  EXPECT_EQ(report->reason, SourceReport::Reason::Absent);
+}
+
+TEST(DmiSource, AnEmbeddedControllerOf255And255IsNone) {
+  const Machine machine("sys/class/dmi/id/ec_firmware_release = 255.255");
   EXPECT_EQ(shown(discoverAt(machine)), "40 Computer System\n");
 }
 

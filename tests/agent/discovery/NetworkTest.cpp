@@ -1,5 +1,6 @@
 #include "Machine.h"
 
+#include <agent/discovery/BusAddress.h>
 #include <agent/discovery/network/Interfaces.h>
 
 #include <gtest/gtest.h>
