@@ -10,7 +10,7 @@ namespace agent::discovery {
 namespace {
 
 constexpr const char* tablePath = "proc/cpuinfo";
-constexpr std::size_t tableLimit = 4U * 1024U * 1024U;  // about 2500 processors
+constexpr std::size_t tableLimit = std::size_t{4} * 1024 * 1024;  // about 2500 processors
 
 ProcessorTable readTable(SourceContext& context) {
   context.doing(context.root().outside(tablePath));

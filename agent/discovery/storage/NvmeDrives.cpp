@@ -39,6 +39,7 @@ std::vector<FoundNode> readNvmeDrives(SourceContext& context) {
     byAddress.emplace(address, std::move(drive));
   }
   std::vector<FoundNode> drives;
+  drives.reserve(byAddress.size());
   for (auto& [address, drive] : byAddress) {
     drives.push_back(std::move(drive));
   }

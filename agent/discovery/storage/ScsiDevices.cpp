@@ -129,6 +129,7 @@ std::vector<FoundNode> readScsiDevices(SourceContext& context) {
     }
   }
   std::vector<FoundNode> nodes;
+  nodes.reserve(byPlace.size());
   for (auto& [place, node] : byPlace) {
     nodes.push_back(std::move(node));
   }

@@ -7,6 +7,7 @@
 #include <optional>
 #include <string>
 #include <string_view>
+#include <tuple>
 
 namespace agent::discovery {
 
@@ -17,7 +18,10 @@ struct ScsiAddress {
   std::uint32_t target = 0;
   std::uint64_t lun = 0;
 
-  friend auto operator<=>(const ScsiAddress&, const ScsiAddress&) = default;
+  friend bool operator<(const ScsiAddress& left, const ScsiAddress& right) {
+    return std::tie(left.host, left.channel, left.target, left.lun) <
+           std::tie(right.host, right.channel, right.target, right.lun);
+  }
 };
 
 std::optional<ScsiAddress> parseScsiAddress(std::string_view text);
