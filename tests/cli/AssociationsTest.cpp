@@ -19,7 +19,6 @@ using cli_test::swinv;
 using cli_test::testFile;
 using testing::ElementsAre;
 using testing::ElementsAreArray;
-using testing::HasSubstr;
 using testing::IsEmpty;
 using testing::UnorderedElementsAreArray;
 
