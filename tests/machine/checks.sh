@@ -1,3 +1,4 @@
+# shellcheck shell=bash disable=SC2154 # run-case, which reads this file, sets share, name, build, here and others
 # What a case expects of the files that its commands wrote. Each check is noted as the case is read, and made when the
 # machine has run; all are made, so that one run tells all that is wrong.
 
@@ -87,9 +88,13 @@ bytesAgree() {
 }
 
 numberIsBelow() {
+  local number
   hasText "$1" || return 1
-  [ "$(cat "$1")" -ge "$2" ] || return 0
-  echo "$1 holds $(cat "$1"), which is not below $2"
+  number=$(cat "$1")
+  if [[ $number =~ ^-?[0-9]+$ ]] && [ "$number" -lt "$2" ]; then
+    return 0
+  fi
+  echo "$1 holds $number, which is not a number below $2"
   return 1
 }
 
@@ -104,7 +109,7 @@ runsHere() {
 verify() {
   local one failed=0
   [ ${#checks[@]} -gt 0 ] || { echo "$name checks nothing"; exit 1; }
-  cd "$share"
+  cd "$share" || exit 1
   for one in "${checks[@]}"; do
     eval "$one" >check.log 2>&1 || { failed=$((failed + 1)); sed 's/^/FAILED: /' check.log; }
   done
@@ -114,7 +119,7 @@ verify() {
     return
   fi
   [ -s errors ] && suspects+=(errors)
-  printf '%s\n' "${suspects[@]}" | sort -u | while read -r one; do
+  for one in $(printf "%s\n" "${suspects[@]}" | sort -u); do
     echo "--- $share/$one"
     tail -n 80 "$one"
   done

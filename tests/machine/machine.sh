@@ -1,3 +1,4 @@
+# shellcheck shell=bash disable=SC2154 # run-case, which reads this file, sets share, name, build, here and others
 # The emulated machine: the words in which a case describes it, and its life from power-on to power-off.
 
 devices=()                    # qemu's arguments, beside those that every machine has
@@ -43,6 +44,12 @@ structure() {
     printf '\0'
   } >"$file"
   devices+=(-smbios "file=$file")
+}
+
+# monitor: the commands of the case may steer the emulator.
+monitor() {
+  mkfifo "$sockets/monitor.in" "$sockets/monitor.out"
+  devices+=(-chardev "pipe,id=monitor,path=$sockets/monitor" -mon chardev=monitor,mode=readline)
 }
 
 # program COMMAND...: a process beside the machine, which ends with it.
@@ -112,6 +119,7 @@ boot() {
     # It has no clock to measure that of the processor by, which is the clock of this machine.
     clock="tsc_early_khz=$(sed -n "s/^cpu MHz.*: *\([0-9]*\)\..*/\1000/p" /proc/cpuinfo | head -n 1)"
   fi
+  # shellcheck disable=SC2054 # the commas are qemu's
   all=(-nodefaults -no-user-config -display none -vga none -no-reboot
     -machine "$chosen,accel=tcg" -cpu qemu64 -m 512 -smp 1
     -L "$root/usr/share/qemu" -L "$root/usr/share/seabios"
@@ -135,9 +143,14 @@ boot() {
   started+=("$process")
   while kill -0 "$process" 2>/dev/null; do
     [ "$SECONDS" -lt "$end" ] || died "the machine did not come to an end within $bound seconds"
+    # What the guest asks of the emulator; see guest/session.
+    if [ -f "$share/asked" ]; then
+      cat "$share/asked" >"$sockets/monitor.in"
+      rm "$share/asked"
+    fi
     sleep 0.2
   done
   wait "$process" || died "the emulator failed: $(cat "$share/qemu.log")"
-  [ -f "$share/done" ] || died "the machine stopped before its commands were done. $(cat "$share/qemu.log")"
+  [ -f "$share/finished" ] || died "the machine stopped before its commands were done. $(cat "$share/qemu.log")"
   echo "$name: ran $((SECONDS - begin)) s"
 }
