@@ -37,6 +37,15 @@ TEST(ParseNumber, AnythingElseIsNone) {
   EXPECT_EQ(parseNumber("17", 16), std::nullopt);
 }
 
+TEST(ZeroVersion, IsNothingButZerosAndWhatStandsBetween) {
+  for (const char* text : {"0", "00.00.00.00", "0.0", "0x0", "0x00000000", "0:0"}) {
+    EXPECT_TRUE(isZeroVersion(text)) << text;
+  }
+  for (const char* text : {"", ".", "00.00.01.00", "1", "0a", "v0"}) {
+    EXPECT_FALSE(isZeroVersion(text)) << text;
+  }
+}
+
 TEST(JoinNames, CountsWhatIsTooMuch) {
   EXPECT_EQ(joinNames({}, 10), "");
   EXPECT_EQ(joinNames({"a"}, 10), "a");
