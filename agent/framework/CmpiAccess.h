@@ -15,10 +15,11 @@
 
 namespace agent::cmpi {
 
-/// CIM names are compared without case, whatever the locale of the process.
+/// CIM names are compared without case, whatever the locale of the process. Most are spelled the same.
 inline bool sameName(std::string_view left, std::string_view right) {
-  return left.size() == right.size() && std::equal(left.begin(), left.end(), right.begin(),
-                                                   [](char a, char b) { return lower(a) == lower(b); });
+  return left.size() == right.size() &&
+         (left == right || std::equal(left.begin(), left.end(), right.begin(),
+                                      [](char a, char b) { return lower(a) == lower(b); }));
 }
 
 /// The function table of an object; null where there is no object or it has none.

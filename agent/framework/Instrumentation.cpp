@@ -39,6 +39,15 @@ struct Cursor {
     end = std::lower_bound(current, last, to);
   }
   [[nodiscard]] bool isOnNode() const { return current != end; }
+  /// On the last steps before the end of the tree's own list there is nothing to have fetched.
+  void step() {
+    ++current;
+    if (end - current > fetchedAhead) {
+      tree->prefetch(current[fetchedAhead]);
+      tree->prefetchParent(current[fetchedAhead / 2]);
+    }
+  }
+  static constexpr std::ptrdiff_t fetchedAhead = 16;
 
   std::shared_ptr<const NodeTree> tree;
   std::span<const Index> selected;
@@ -74,22 +83,29 @@ Index nodeAt(const NodeTree& tree, const std::string& path) {
   return tree.find(*number);
 }
 
-/// A path as a string of its own; `path` ends with a NUL. Numbers have 60 bits, of which nearly all need 15
-/// digits: these are copied as one piece of 16 bytes, with their end, in place of a call. One piece also lets
-/// the reader of the copy have its bytes before they reach the memory, which processors do for what was
-/// stored at once.
-[[gnu::always_inline]] inline std::string copyOf(std::string_view path) {
-  constexpr std::string_view usual = "...............";
-  if (path.size() != usual.size()) {
-    return std::string(path);
+/// Numbers have 60 bits, so that nearly all paths have this many digits.
+constexpr std::string_view usualPath = "...............";
+
+/// A text of the usual length or less as a string of its own. `NodeTree::pathRoom` characters are copied as
+/// one piece, with the end, in place of a call. One piece also lets the reader of the copy have its bytes
+/// before they reach the memory, which processors do for what was stored at once.
+[[gnu::always_inline]] inline std::string copyInOnePiece(std::string_view path) {
+  static_assert(NodeTree::pathRoom == usualPath.size() + 1);
+  std::string copy(usualPath);
+  std::memcpy(copy.data(), path.data(), NodeTree::pathRoom);
+  if (path.size() < usualPath.size()) {
+    copy.resize(path.size());
   }
-  std::string copy(usual);
-  std::memcpy(copy.data(), path.data(), usual.size() + 1);
   return copy;
 }
 
-std::string pathOf(const NodeTree& tree, Index node) {
-  return node == NodeTree::none ? std::string() : copyOf(tree.path(node));
+/// The path of a node; empty for none.
+[[gnu::always_inline]] inline std::string pathOf(const NodeTree& tree, Index node) {
+  if (node == NodeTree::none) {
+    return {};
+  }
+  const std::string_view path = tree.path(node);
+  return path.size() <= usualPath.size() ? copyInOnePiece(path) : std::string(path);
 }
 
 std::string nothingPasses(NodeLexicon::PathType type, const std::string& path) {
@@ -159,7 +175,7 @@ Instrumentation::operator bool() {
 
 void Instrumentation::operator++() {
   if (onNode(state_) != nullptr) {
-    ++cursorOf(state_)->current;
+    cursorOf(state_)->step();
   }
 }
 
@@ -180,7 +196,7 @@ std::string Instrumentation::getPathToComputer() {
 
 // A path is the hexadecimal text itself.
 std::string Instrumentation::convertPathToString(const std::string& path) {
-  return copyOf(path);
+  return path.size() == usualPath.size() ? copyInOnePiece(path) : path;
 }
 
 std::string Instrumentation::convertStringToPath(const std::string& text) {

@@ -22,8 +22,9 @@ std::vector<PropertyView> NodeTree::properties(Index node) const {
 }
 
 std::span<const NodeTree::Index> NodeTree::ofType(int type) const {
-  const auto found = std::lower_bound(typeRanges_.begin(), typeRanges_.end(), type,
-                                      [](const TypeRange& range, int wanted) { return range.type < wanted; });
+  // A tree has a handful of types: looking at each is faster than halving.
+  const auto found = std::find_if(typeRanges_.begin(), typeRanges_.end(),
+                                  [type](const TypeRange& range) { return range.type >= type; });
   if (found == typeRanges_.end() || found->type != type) {
     return {};
   }

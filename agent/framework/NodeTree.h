@@ -7,6 +7,8 @@
 
 #include <Oru/NodeLexicon.h>
 
+#include <array>
+#include <bit>
 #include <cstddef>
 #include <cstdint>
 #include <optional>
@@ -77,11 +79,21 @@ class NodeTree {
   [[nodiscard]] Index parent(Index node) const { return nodes_[node].parent; }
   /// One past the last node below `node`: what is below it is the range [node + 1, subtreeEnd(node)).
   [[nodiscard]] Index subtreeEnd(Index node) const { return nodes_[node].subtreeEnd; }
+  /// Has the processor fetch what a walk will soon read: a node, or the parent of one that was fetched.
+  void prefetch(Index node) const { __builtin_prefetch(&nodes_[node]); }
+  void prefetchParent(Index node) const {
+    if (nodes_[node].parent != none) {
+      __builtin_prefetch(&nodes_[nodes_[node].parent]);
+    }
+  }
   /// The nearest computer system at or above `node`, or `none`.
   [[nodiscard]] Index computer(Index node) const { return nodes_[node].computer; }
-  /// The number's path text, as `pathText` writes it, with a NUL behind it. Kept ready, because every
-  /// published name holds two of them.
-  [[nodiscard]] std::string_view path(Index node) const { return view(nodes_[node].path); }
+  /// The number's path text, as `pathText` writes it. Kept ready, because every published name holds two of
+  /// them; `pathRoom` characters can be read there, NULs behind the text where it is shorter.
+  [[nodiscard]] std::string_view path(Index node) const {
+    return {nodes_[node].path.data(), pathLength(nodes_[node].number)};
+  }
+  static constexpr std::size_t pathRoom = 16;
   [[nodiscard]] std::string_view description(Index node) const { return view(nodes_[node].description); }
   /// What the number was made of, with the type: the node's place on its bus. May be empty (numbers given
   /// outright).
@@ -112,9 +124,10 @@ class NodeTree {
     std::uint32_t begin = 0;
     std::uint32_t length = 0;
   };
-  struct Node {
+  /// One line of the processor's caches, with all that a name takes of a node.
+  struct alignas(64) Node {
     NodeNumber number = noNumber;
-    TextRange path;
+    std::array<char, pathRoom> path{};
     Index parent = none;
     Index subtreeEnd = 0;
     Index computer = none;
@@ -135,6 +148,10 @@ class NodeTree {
     std::uint32_t end = 0;
   };
 
+  /// How many hexadecimal digits a number has.
+  static constexpr std::size_t pathLength(NodeNumber number) {
+    return (67U - static_cast<unsigned int>(std::countl_zero(number | 1U))) / 4;
+  }
   [[nodiscard]] std::string_view view(TextRange range) const {
     return {texts_.data() + range.begin, range.length};
   }

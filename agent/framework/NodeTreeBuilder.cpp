@@ -251,8 +251,7 @@ void NodeTreeBuilder::giveNumbers(NodeTree& tree, const std::vector<Handle>& ord
 void NodeTreeBuilder::keepPaths(NodeTree& tree) {
   for (NodeTree::Node& node : tree.nodes_) {
     const std::string path = pathText(node.number);
-    node.path = {static_cast<std::uint32_t>(tree.texts_.size()), static_cast<std::uint32_t>(path.size())};
-    tree.texts_.append(path.c_str(), path.size() + 1);
+    path.copy(node.path.data(), node.path.size());
   }
 }
 

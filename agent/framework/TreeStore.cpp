@@ -4,6 +4,7 @@
 #include <Oru/Exceptions.h>
 #include <ZelLog/ZelLogger.h>
 
+#include <ctime>
 #include <exception>
 #include <thread>
 #include <utility>
@@ -24,6 +25,15 @@ void logFailure(const char* function, unsigned int line, const std::string& mess
 TreeStore& TreeStore::instance() {
   static TreeStore* const store = std::make_unique<TreeStore>().release();
   return *store;
+}
+
+std::chrono::steady_clock::time_point TreeStore::lastTick() {
+  timespec time{};
+  if (clock_gettime(CLOCK_MONOTONIC_COARSE, &time) != 0) {
+    return std::chrono::steady_clock::now();
+  }
+  return std::chrono::steady_clock::time_point(std::chrono::seconds(time.tv_sec) +
+                                               std::chrono::nanoseconds(time.tv_nsec));
 }
 
 TreeStore::TreeStore(Duration lifetime, Clock clock) : lifetime_(lifetime), clock_(std::move(clock)) {}

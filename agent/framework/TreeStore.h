@@ -27,7 +27,11 @@ class TreeStore {
   /// The store of this process. It is never destroyed: a thread may still ask it while the process ends.
   static TreeStore& instance();
 
-  explicit TreeStore(Duration lifetime = usualLifetime, Clock clock = std::chrono::steady_clock::now);
+  /// The steady clock by the kernel's last tick, a few milliseconds late at most: every request asks it, and
+  /// this costs a fraction of the exact time.
+  static std::chrono::steady_clock::time_point lastTick();
+
+  explicit TreeStore(Duration lifetime = usualLifetime, Clock clock = lastTick);
   /// As `waitForRereading`.
   ~TreeStore();
   TreeStore(const TreeStore&) = delete;

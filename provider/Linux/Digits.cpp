@@ -30,6 +30,16 @@ void store(char* characters, std::uint64_t word) {
   std::memcpy(characters, &word, sizeof word);
 }
 
+/// The value of a hexadecimal digit; above 15 for any other character.
+constexpr unsigned int valueOf(unsigned char character) {
+  const unsigned int decimal = character - unsigned{'0'};
+  if (decimal < 10) {
+    return decimal;
+  }
+  const unsigned int letter = (character | 0x20U) - unsigned{'a'};
+  return letter < 6 ? letter + 10 : 16;
+}
+
 /// The high bit of each byte that lies in [first, last]. All must be below 0x80, so that no sum carries into
 /// the next byte.
 constexpr std::uint64_t inRange(std::uint64_t word, unsigned char first, unsigned char last) {
@@ -54,15 +64,20 @@ constexpr std::uint64_t hexadecimalNumber(std::uint64_t word) {
   return (digits | (digits >> 16U)) & 0xFFFFFFFFU;
 }
 
-/// The eight decimal digits of a number below 10^8. It is halved into fours, twos and ones, all halves of a
-/// step at once; the divisions by 100 and 10 are multiplications that are exact for what a half can be.
-constexpr std::uint64_t decimalDigits(std::uint64_t number) {
-  const std::uint64_t upper = number / 10000;
-  const std::uint64_t fours = upper | ((number - upper * 10000) << 32U);
+/// The digits of two numbers below 10^4, the first of which is in the lower half. They are halved into twos
+/// and ones, all halves of a step at once; the divisions by 100 and 10 are multiplications that are exact for
+/// what a half can be.
+constexpr std::uint64_t decimalDigitsOfFours(std::uint64_t fours) {
   const std::uint64_t hundreds = ((fours * 10486) >> 20U) & 0x0000007F0000007FU;
   const std::uint64_t twos = hundreds | ((fours - hundreds * 100) << 16U);
   const std::uint64_t tens = ((twos * 103) >> 10U) & 0x000F000F000F000FU;
   return (tens | ((twos - tens * 10) << 8U)) + inEachByte('0');
+}
+
+/// The eight decimal digits of a number below 10^8.
+constexpr std::uint64_t decimalDigits(std::uint64_t number) {
+  const std::uint64_t upper = number / 10000;
+  return decimalDigitsOfFours(upper | ((number - upper * 10000) << 32U));
 }
 
 }  // namespace
@@ -72,11 +87,15 @@ std::optional<std::uint64_t> numberOfHexadecimalDigits(std::string_view text) {
     return std::nullopt;
   }
   if (text.size() < 8) {
-    std::uint64_t word = inEachByte('0');
+    std::uint64_t number = 0;
     for (const char character : text) {
-      word = (word >> 8U) | (std::uint64_t{static_cast<unsigned char>(character)} << 56U);
+      const unsigned int digit = valueOf(static_cast<unsigned char>(character));
+      if (digit > 15) {
+        return std::nullopt;
+      }
+      number = number << 4U | digit;
     }
-    return areHexadecimal(word) ? std::optional(hexadecimalNumber(word)) : std::nullopt;
+    return number;
   }
   // Where the first eight and the last eight digits overlap, they are the same.
   const std::uint64_t first = load(text.data());
@@ -87,23 +106,39 @@ std::optional<std::uint64_t> numberOfHexadecimalDigits(std::string_view text) {
   return (hexadecimalNumber(first) << (4 * (text.size() - 8))) | hexadecimalNumber(last);
 }
 
-DecimalText::DecimalText(std::uint64_t number) {
+void DecimalText::set(std::uint64_t number, char last) {
   constexpr std::uint64_t eightDigits = 100'000'000;
+  const std::uint64_t end = static_cast<unsigned char>(last);
   const std::uint64_t upper = number / eightDigits;
-  const std::array words{decimalDigits(upper / eightDigits), decimalDigits(upper % eightDigits),
-                         decimalDigits(number % eightDigits)};
-  for (std::size_t i = 0; i < words.size(); ++i) {
-    store(digits_.data() + 8 * i, words[i]);
-  }
-  begin_ = 0;
-  for (const std::uint64_t word : words) {
-    if (const std::uint64_t values = word - inEachByte('0'); values != 0) {
-      begin_ += static_cast<std::size_t>(std::countr_zero(values)) / 8;
-      return;
+  const std::uint64_t lowestDigits = decimalDigits(number - upper * eightDigits);
+  if (upper == 0) {
+    keep(lowestDigits, end, 0, 0);
+  } else {
+    const std::uint64_t top = upper / eightDigits;  // below 10^4
+    const std::uint64_t middleDigits = decimalDigits(upper - top * eightDigits);
+    if (top == 0) {
+      keep(middleDigits, lowestDigits, end, 0);
+      length_ += 8;
+    } else {
+      keep(decimalDigitsOfFours(top << 32U), middleDigits, lowestDigits, end);
+      length_ += 16;
     }
-    begin_ += 8;
   }
-  begin_ = digits_.size() - 1;  // 0 has a digit, too
+  length_ -= last == '\0' ? 1 : 0;
+}
+
+/// Keeps the characters of four words without the zeros that the first begins with; its last digit stays,
+/// because 0 has a digit, too. The length is what is left of the first, and the character behind all digits.
+[[gnu::always_inline]] inline void DecimalText::keep(std::uint64_t first, std::uint64_t second,
+                                                     std::uint64_t third, std::uint64_t fourth) {
+  const std::uint64_t values = (first - inEachByte('0')) | (std::uint64_t{1} << 56U);
+  const auto zeros = static_cast<unsigned int>(std::countr_zero(values)) / 8;
+  const unsigned int shift = zeros * 8;
+  const unsigned int rest = 63 - shift;
+  store(characters_.data(), (first >> shift) | (second << 1U << rest));
+  store(characters_.data() + 8, (second >> shift) | (third << 1U << rest));
+  store(characters_.data() + 16, (third >> shift) | (fourth << 1U << rest));
+  length_ = 9 - zeros;
 }
 
 }  // namespace Oru::SoftwareInventoryProfileProvider

@@ -4,7 +4,6 @@
 #include <cstring>
 #include <tuple>
 
-#include "Linux/Digits.h"
 #include "Linux/StreamExtraction.h"
 
 namespace Oru::SoftwareInventoryProfileProvider {
@@ -23,23 +22,23 @@ void InstanceIdMaker::make(const std::string& parentText, const std::string& nod
   const std::uint64_t parent = numberOf(parentText);
   if (parent != parent_) {
     parent_ = parent;
-    prefixLength_ = DecimalText(parent).view().copy(prefix_.data(), prefix_.size() - 1);
-    prefix_[prefixLength_++] = '@';
+    prefix_.set(parent, '@');
   }
+  const std::string_view prefix = prefix_.view();
   // Nearly all node texts are of this length, and so are nearly all InstanceIDs of what went before: pieces
   // of known lengths, the node's with its NUL, are put in place without a call.
   constexpr std::size_t usualLength = 15;
   if (nodeText.size() != usualLength) {
-    instanceId.assign(prefix_.data(), prefixLength_).append(nodeText);
+    instanceId.assign(prefix).append(nodeText);
     return;
   }
-  instanceId.resize(prefixLength_ + usualLength);
-  if (prefixLength_ <= 16) {
-    std::memcpy(instanceId.data(), prefix_.data(), 16);
+  instanceId.resize(prefix.size() + usualLength);
+  if (prefix.size() <= 16) {
+    std::memcpy(instanceId.data(), prefix.data(), 16);
   } else {
-    std::memcpy(instanceId.data(), prefix_.data(), prefix_.size());
+    std::memcpy(instanceId.data(), prefix.data(), DecimalText::room);
   }
-  std::memcpy(instanceId.data() + prefixLength_, nodeText.data(), usualLength + 1);
+  std::memcpy(instanceId.data() + prefix.size(), nodeText.data(), usualLength + 1);
 }
 
 std::string nodeNumber(const std::string& pathText) {

@@ -4,11 +4,12 @@
 // software below that parent.
 #pragma once
 
-#include <array>
 #include <cstddef>
 #include <cstdint>
 #include <string>
 #include <string_view>
+
+#include "Linux/Digits.h"
 
 namespace Oru::SoftwareInventoryProfileProvider {
 
@@ -22,8 +23,7 @@ class InstanceIdMaker {
 
  private:
   std::uint64_t parent_ = 0;
-  std::array<char, 24> prefix_{'0', '@'};  ///< what an InstanceID below parent_ begins with
-  std::size_t prefixLength_ = 2;
+  DecimalText prefix_{parent_, '@'};  ///< what an InstanceID below parent_ begins with
 };
 
 /// What an InstanceID says, as stream extraction reads it: a decimal number, one character, a word.

@@ -257,7 +257,8 @@ bool SoftwareIdentity::getClassificationDescriptions(std::vector<std::string>& d
   return true;
 }
 
-bool SoftwareIdentity::getInstanceID(std::string& instanceId) {
+// Half of what a name costs above its calls: put together in one place.
+[[gnu::flatten]] bool SoftwareIdentity::getInstanceID(std::string& instanceId) {
   const TraceScope scope(loggerSoftwareIdentity);
   const std::string parent = instrumentation.convertPathToString(instrumentation.getPathToParentNode());
   const std::string node = instrumentation.convertPathToString(instrumentation.getPathToNode());
