@@ -117,7 +117,7 @@ std::string updateText(std::uint16_t characteristics) {
 
 void setNumbers(SourceContext& context, const std::string& place, const Firmware& firmware, FoundNode& node) {
   if (firmware.versionFormat == Firmware::MajorMinor) {
-    // A text of another form is a version all the same: boards exist that give this format to "N95V106".
+    // A text of another form is a version all the same: boards exist that give this format to "K71V204".
     if (const auto numbers = parseMajorMinor(meant(firmware.version).value_or(""))) {
       node.setValue(Oru::NodeLexicon::MajorVersionProperty, numbers->major);
       node.setValue(Oru::NodeLexicon::MinorVersionProperty, numbers->minor);

@@ -14,7 +14,7 @@ namespace agent::discovery {
 std::optional<std::string> parseBiosDate(std::string_view text);
 
 /// "MM/DD/YYYY" of a date as declared firmware has it: in SMBIOS form, or year, month and day as ISO 8601 has
-/// them ("2021-05-15", "20210515"), alone or with a time of the day behind it ("2021-05-15T00:00:00Z"). The
+/// them ("2022-04-11", "20220411"), alone or with a time of the day behind it ("2022-04-11T00:00:00Z"). The
 /// day stays the one that is written, whatever the time zone. Nothing where the text has another form or
 /// names no day of the calendar.
 std::optional<std::string> parseFirmwareDate(std::string_view text);
@@ -34,7 +34,7 @@ struct ReleaseNumbers {
 /// "5.17"; each part is one byte.
 std::optional<ReleaseNumbers> parseBiosRelease(std::string_view text);
 
-/// "60020.6"; each part is a number of any size that has 32 bits.
+/// "31007.2"; each part is a number of any size that has 32 bits.
 std::optional<ReleaseNumbers> parseMajorMinor(std::string_view text);
 
 }  // namespace agent::discovery

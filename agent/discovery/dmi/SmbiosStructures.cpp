@@ -89,9 +89,9 @@ Firmware decodeFirmware(const Structure& structure) {
   firmware.date = structure.stringAt(0x09);
   firmware.maker = structure.stringAt(0x0a);
   firmware.lowestVersion = structure.stringAt(0x0b);
-  firmware.imageSize = structure.at<std::uint64_t>(0x0c);
-  if (firmware.imageSize == std::numeric_limits<std::uint64_t>::max() || firmware.imageSize == 0U) {
-    firmware.imageSize.reset();
+  if (const std::uint64_t size = structure.at<std::uint64_t>(0x0c).value_or(0);
+      size != 0 && size != std::numeric_limits<std::uint64_t>::max()) {
+    firmware.imageSize = size;
   }
   firmware.characteristics = structure.at<std::uint16_t>(0x14);
   firmware.state = structure.at<std::uint8_t>(0x16);

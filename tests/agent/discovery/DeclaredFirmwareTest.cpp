@@ -40,16 +40,16 @@ std::string declared(const std::string& name, const std::string& version, const 
 TEST(DeclaredFirmware, ShowsAllThatIsDeclared) {
   const NodeTree tree = treeOf(
       "45 @0x2d: 1b 2b 1b 3b 1b 4b 5b 6b 0x00100000q 0x0003w 4b 0b "
-      "| Backplane | 60020.6 | 0F3A6F2C-11B1-4B4B-9F2C-000000000001 | 2021-05-15T00:00:00Z | Corvane | 1.2\n"
+      "| Backplane | 31007.2 | 0F3A6F2C-11B1-4B4B-9F2C-000000000001 | 2022-04-11T00:00:00Z | Corvane | 1.2\n"
       "end");
   const NodeTree::Index node = described(tree, "Declared Firmware");
   ASSERT_NE(node, NodeTree::none);
   EXPECT_EQ(tree.type(node), NodeLexicon::FirmwareNode);
   EXPECT_EQ(tree.text(node, NodeLexicon::NameProperty), "Backplane");
-  EXPECT_EQ(tree.text(node, NodeLexicon::VersionStringProperty), "60020.6");
-  EXPECT_EQ(tree.value(node, NodeLexicon::MajorVersionProperty), 60020U);
-  EXPECT_EQ(tree.value(node, NodeLexicon::MinorVersionProperty), 6U);
-  EXPECT_EQ(tree.text(node, NodeLexicon::ReleaseDateProperty), "05/15/2021");
+  EXPECT_EQ(tree.text(node, NodeLexicon::VersionStringProperty), "31007.2");
+  EXPECT_EQ(tree.value(node, NodeLexicon::MajorVersionProperty), 31007U);
+  EXPECT_EQ(tree.value(node, NodeLexicon::MinorVersionProperty), 2U);
+  EXPECT_EQ(tree.text(node, NodeLexicon::ReleaseDateProperty), "04/11/2022");
   EXPECT_EQ(tree.text(node, NodeLexicon::ManufacturerProperty), "Corvane");
   EXPECT_EQ(tree.text(node, FirmwareIdProperty), "0f3a6f2c-11b1-4b4b-9f2c-000000000001");
   EXPECT_EQ(tree.text(node, LowestVersionProperty), "1.2");
@@ -68,7 +68,7 @@ TEST(DeclaredFirmware, AVersionHasNumbersOnlyWhereItsFormatIsMajorMinor) {
   EXPECT_FALSE(numbers("0b", "2.14")) << "free form";
   EXPECT_FALSE(numbers("2b", "0x0002000e"));
   EXPECT_FALSE(numbers("128b", "2.14")) << "a maker's own format";
-  EXPECT_FALSE(numbers("1b", "N95V106"));
+  EXPECT_FALSE(numbers("1b", "K71V204"));
 }
 
 TEST(DeclaredFirmware, UnsetIdsAndDatesAndUnknownSizesAndStatesAreAbsent) {
@@ -132,9 +132,9 @@ TEST(DeclaredFirmware, TheSameVersionAloneMergesNothing) {
 
 TEST(DeclaredFirmware, AHandleOfTheSystemFirmwareUnderAnotherVersionMakesNoSecondBios) {
   // Boards exist that leave the handle of other firmware at 0, which is the system firmware's.
-  const NodeTree tree = treeOf(bios + declared("Backplane", "60020.6", "", "0w 4b 1b 0x0000w") + "end");
+  const NodeTree tree = treeOf(bios + declared("Backplane", "31007.2", "", "0w 4b 1b 0x0000w") + "end");
   EXPECT_EQ(shown(tree), "40 Computer System\n" + std::string(biosNode) +
-                             "\n  3 Declared Firmware 108=\"Backplane\" 307=\"60020.6\" 1004=\"enabled\" "
+                             "\n  3 Declared Firmware 108=\"Backplane\" 307=\"31007.2\" 1004=\"enabled\" "
                              "1008=\"not updatable\"\n");
 }
 
@@ -147,13 +147,13 @@ TEST(DeclaredFirmware, ASpareImageOfTheSameVersionStaysAnElementOfItsOwn) {
 }
 
 TEST(DeclaredFirmware, TheTpmsDeclaredAgainKeepsTheMachinesOwnText) {
-  const NodeTree tree = treeOf(bios + std::string("43 @8: 0x00444d41d 2b 0b 0x00060020d 6d 0b 0q 0d\n") +
-                               declared("TPM Firmware", "60020.6", "2021-05-15", "0w 4b 1b 0w") + "end");
+  const NodeTree tree = treeOf(bios + std::string("43 @8: 0x00565243d 2b 0b 0x00031007d 2d 0b 0q 0d\n") +
+                               declared("TPM Firmware", "31007.2", "2022-04-11", "0w 4b 1b 0w") + "end");
   EXPECT_EQ(shown(tree),
             "40 Computer System\n" + std::string(biosNode) +
-                "\n  1000 TPM 36=\"AMD\"\n"
-                "    3 TPM Firmware 36=\"AMD\" 104=6 107=32 108=\"TPM Firmware\" 164=\"05/15/2021\" "
-                "307=\"60020.6\" 1004=\"enabled\" 1008=\"not updatable\"\n");
+                "\n  1000 TPM 36=\"CRV\"\n"
+                "    3 TPM Firmware 36=\"CRV\" 104=3 107=4103 108=\"TPM Firmware\" 164=\"04/11/2022\" "
+                "307=\"31007.2\" 1004=\"enabled\" 1008=\"not updatable\"\n");
 }
 
 TEST(DeclaredFirmware, StandsBelowTheDeviceThatItsComponentIs) {

@@ -52,25 +52,25 @@ TEST(BiosReleaseText, OtherFormsAreNone) {
 TEST(FirmwareDate, OfSmbiosAndOfIso8601BecomesMonthDayYear) {
   EXPECT_EQ(parseFirmwareDate("3/9/2023"), "03/09/2023");
   EXPECT_EQ(parseFirmwareDate("3/9/99"), "03/09/1999");
-  for (const char* text : {"2021-05-15", "20210515", "2021-05-15T00:00:00Z", "2021-05-15T23:59:59.5+08:00",
-                           "2021-05-15 12:00", "20210515T120000Z", "2021-05-15t01z"}) {
-    EXPECT_EQ(parseFirmwareDate(text), "05/15/2021") << text;
+  for (const char* text : {"2022-04-11", "20220411", "2022-04-11T00:00:00Z", "2022-04-11T23:59:59.5+08:00",
+                           "2022-04-11 12:00", "20220411T120000Z", "2022-04-11t01z"}) {
+    EXPECT_EQ(parseFirmwareDate(text), "04/11/2022") << text;
   }
 }
 
 TEST(FirmwareDate, OtherFormsAndDaysOfNoCalendarAreNone) {
   for (const char* text : {"", "2021", "2021-05", "2021-5-15", "2021-02-29", "2021-13-01", "0000-00-00",
-                           "2021051", "2021-05-15T", "2021-05-15Tz", "2021-05-15 noon", "2021-05-15x",
-                           "15-05-2021", "2021/05/15", "2021-0515", "+021-05-15", "20210515-1"}) {
+                           "2022041", "2022-04-11T", "2022-04-11Tz", "2022-04-11 noon", "2022-04-11x",
+                           "15-05-2021", "2021/05/15", "2021-0515", "+021-05-15", "20220411-1"}) {
     EXPECT_EQ(parseFirmwareDate(text), std::nullopt) << text;
   }
 }
 
 TEST(MajorMinor, IsTwoNumbersOf32Bits) {
-  const auto numbers = parseMajorMinor("60020.6");
+  const auto numbers = parseMajorMinor("31007.2");
   ASSERT_TRUE(numbers);
-  EXPECT_EQ(numbers->major, 60020U);
-  EXPECT_EQ(numbers->minor, 6U);
+  EXPECT_EQ(numbers->major, 31007U);
+  EXPECT_EQ(numbers->minor, 2U);
   EXPECT_EQ(parseMajorMinor("4294967295.0")->major, 0xffffffffU);
   for (const char* text :
        {"", "1", "1.", ".1", "1.2.3", "v1.2", "1.2a", "4294967296.0", "99999999999.0", "0x1.2"}) {
