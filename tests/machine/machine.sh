@@ -49,6 +49,7 @@ structure() {
 # monitor: the commands of the case may steer the emulator.
 monitor() {
   mkfifo "$sockets/monitor.in" "$sockets/monitor.out"
+  # shellcheck disable=SC2054 # the commas are qemu's
   devices+=(-chardev "pipe,id=monitor,path=$sockets/monitor" -mon chardev=monitor,mode=readline)
 }
 
