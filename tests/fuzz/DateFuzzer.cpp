@@ -13,7 +13,12 @@ void fuzz::tryOne(std::string_view input) {
   if (const auto date = agent::discovery::parseBiosDate(input)) {
     promise(date->size() == 10, "a date of SMBIOS that is not MM/DD/YYYY");
   }
+  if (const auto date = agent::discovery::parseFirmwareDate(input)) {
+    promise(date->size() == 10, "a date of declared firmware that is not MM/DD/YYYY");
+  }
+  static_cast<void>(agent::discovery::isUnset(input));
   static_cast<void>(agent::discovery::parseBiosRelease(input));
+  static_cast<void>(agent::discovery::parseMajorMinor(input));
   if (cimom::isDateTimeText(input)) {
     promise(input.size() == 25, "a datetime that has not 25 characters");
     static_cast<void>(cimom::microsecondsOf(input));
