@@ -24,9 +24,10 @@ bool neverPublished(CallSite site = CallSite::here()) {
 
 }  // namespace
 
-SoftwareIdentity::SoftwareIdentity()
-    : nodeTypes{NodeLexicon::FirmwareNode, NodeLexicon::BiosNode, NodeLexicon::DriverNode},
-      currentNodeType(nodeTypes.begin()) {
+const std::vector<NodeLexicon::NodeType> SoftwareIdentity::nodeTypes{
+    NodeLexicon::FirmwareNode, NodeLexicon::BiosNode, NodeLexicon::DriverNode};
+
+SoftwareIdentity::SoftwareIdentity() : currentNodeType(nodeTypes.begin()) {
   const TraceScope scope(loggerSoftwareIdentity);
   while (currentNodeType != nodeTypes.end() && !selectCurrentNodeType()) {
     ++currentNodeType;

@@ -131,8 +131,8 @@ class SoftwareIdentity {
   std::string filterPath;
   Instrumentation instrumentation;
   std::vector<Filter> filters;
-  std::vector<NodeLexicon::NodeType> nodeTypes;
-  std::vector<NodeLexicon::NodeType>::iterator currentNodeType;
+  static const std::vector<NodeLexicon::NodeType> nodeTypes;  ///< in the order of the walk
+  std::vector<NodeLexicon::NodeType>::const_iterator currentNodeType;
   DateFormatter dateBuffer;  ///< holds the last formatted date
   InstanceIdMaker instanceIds;
   FirmwareKind lastFirmwareKind;  ///< of the description that was asked about last
