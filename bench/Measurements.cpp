@@ -1,7 +1,9 @@
 #include <bench/Measurements.h>
+#include <bench/SampleMachine.h>
 #include <malloc.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <fstream>
 #include <stdexcept>
 
@@ -105,6 +107,56 @@ std::vector<std::string> Peer::instanceIds() {
     return true;
   }));
   return ids;
+}
+
+namespace {
+
+constexpr const char* installedClass = "KELVO_InstalledSoftwareIdentity";
+
+std::vector<std::filesystem::path> filesOf(const std::filesystem::path& folder,
+                                           const std::string& extension) {
+  std::vector<std::filesystem::path> files;
+  for (const auto& entry : std::filesystem::directory_iterator(folder)) {
+    if (entry.path().extension() == extension) {
+      files.push_back(entry.path());
+    }
+  }
+  std::sort(files.begin(), files.end());
+  return files;
+}
+
+}  // namespace
+
+Associations::Associations(const std::filesystem::path& build) {
+  const std::filesystem::path schema = build / "share/swinv/schema";
+  cimom::Configuration configuration;
+  configuration.schema = filesOf(schema, ".mof");
+  configuration.providerFolder = build / "lib";
+  for (const std::filesystem::path& file : filesOf(schema, ".reg")) {
+    for (cimom::ProviderRegistration& registration : cimom::readRegistrations(file)) {
+      configuration.providers.push_back(std::move(registration));
+    }
+  }
+  manager_ = std::make_unique<cimom::ObjectManager>(configuration);
+}
+
+std::string Associations::computer() {
+  return std::string(R"(KELVO_ComputerSystem.CreationClassName="KELVO_ComputerSystem",Name=")") +
+         sampleComputerName + '"';
+}
+
+std::string Associations::software(const std::string& instanceId) {
+  return std::string(className) + ".InstanceID=\"" + instanceId + '"';
+}
+
+std::size_t Associations::installedNames(const std::string& path) {
+  return delivered(manager_->associatorNames(path, {.associationClass = installedClass},
+                                             [](const cimom::ObjectPath&) { return true; }));
+}
+
+std::size_t Associations::installed() {
+  return delivered(manager_->enumerateInstances(nameSpace, installedClass, std::nullopt,
+                                                [](const cimom::Instance&) { return true; }));
 }
 
 std::size_t residentBytes() {

@@ -26,7 +26,7 @@ agent::NodeTree sampleMachine(std::size_t softwareElements) {
   NodeTreeBuilder builder;
   const auto computer = builder.add(NodeTreeBuilder::noParent, Oru::NodeLexicon::ComputerSystemNode,
                                     agent::computerPosition, "Computer System");
-  builder.setText(computer, Oru::NodeLexicon::NameProperty, "sample");
+  builder.setText(computer, Oru::NodeLexicon::NameProperty, sampleComputerName);
   for (std::size_t i = 0; i < softwareElements; ++i) {
     const std::string address = busAddress(i);
     NodeTreeBuilder::Handle node = 0;
