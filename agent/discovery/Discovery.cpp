@@ -34,6 +34,10 @@ std::vector<Source> makeSources(const DiscoveryOptions& options, const SystemRoo
   if (ethtool == nullptr && root.isLive()) {
     ethtool = discovery::makeKernelEthtool();
   }
+  discovery::NetlinkOpener netlink = options.netlink;
+  if (!netlink && root.isLive()) {
+    netlink = discovery::kernelNetlink();
+  }
   discovery::IpmiOpener ipmi = options.ipmi;
   if (!ipmi && root.isLive()) {
     ipmi = discovery::kernelIpmi();
@@ -46,7 +50,8 @@ std::vector<Source> makeSources(const DiscoveryOptions& options, const SystemRoo
       {"processor", discovery::readProcessor},
       {"tpm", discovery::readTpm},
       {"engine", discovery::readEngine},
-      {"network", [ethtool](SourceContext& context) { discovery::readNetwork(context, ethtool); }},
+      {"network",
+       [ethtool, netlink](SourceContext& context) { discovery::readNetwork(context, ethtool, netlink); }},
       {"storage", discovery::readStorage},
       {"gpu", discovery::readGpu},
       {"drivers",

@@ -8,6 +8,7 @@
 #include <agent/discovery/drivers/ModuleDatabase.h>
 #include <agent/discovery/ipmi/IpmiChannel.h>
 #include <agent/discovery/network/Ethtool.h>
+#include <agent/discovery/network/NetlinkChannel.h>
 #include <agent/framework/NodeTree.h>
 
 #include <chrono>
@@ -26,6 +27,9 @@ struct DiscoveryOptions {
 
   /// Null: the running kernel's where the root is "/", else none.
   std::shared_ptr<discovery::Ethtool> ethtool;
+
+  /// Empty: the running kernel's where the root is "/", else none.
+  discovery::NetlinkOpener netlink;
 
   /// Empty: the running kernel's where the root is "/", else none.
   discovery::IpmiOpener ipmi;

@@ -26,7 +26,7 @@ constexpr std::array<Name, 8> nodeTypes{{
     {DeviceNode, "Device"},
 }};
 
-constexpr std::array<Name, 20> properties{{
+constexpr std::array<Name, 22> properties{{
     {Oru::NodeLexicon::ManufacturerProperty, "Manufacturer"},
     {Oru::NodeLexicon::MajorVersionProperty, "MajorVersion"},
     {Oru::NodeLexicon::MinorVersionProperty, "MinorVersion"},
@@ -47,6 +47,8 @@ constexpr std::array<Name, 20> properties{{
     {ImageSizeProperty, "ImageSize"},
     {UpdateProperty, "Update"},
     {LastAttemptProperty, "LastAttempt"},
+    {StoredVersionProperty, "StoredVersion"},
+    {DeviceDetailsProperty, "DeviceDetails"},
 }};
 
 std::optional<std::string_view> nameIn(std::span<const Name> names, int number) {

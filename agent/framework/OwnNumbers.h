@@ -25,6 +25,10 @@ enum OwnProperty : int {
   UpdateProperty,       ///< of firmware: "updatable" or "not updatable", then ", write-protected" where it is
   LastAttemptProperty,  ///< of firmware: the version of the last attempt to update it, and how that went:
                         ///< "0x00020001: success"
+  StoredVersionProperty,  ///< of firmware: the version in the device's memory, where another one runs: it is
+                          ///< the one of the device's next start
+  DeviceDetailsProperty,  ///< of a device: what its driver tells of it beside versions of firmware,
+                          ///< "board.id=K91258-000", ", " between two
 };
 
 }  // namespace agent

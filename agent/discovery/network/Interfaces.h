@@ -16,8 +16,9 @@ namespace agent::discovery {
 
 /// One interface of a network device.
 struct NetworkInterface {
-  std::string name;        ///< the interface's present name, for people
-  std::uint32_t port = 1;  ///< its port of the device, counted from 1
+  std::string name;          ///< the interface's present name, for people
+  bool hasInterface = true;  ///< false: a port that has no interface now, which nothing can be asked about
+  std::uint32_t port = 1;    ///< its port of the device, counted from 1
   /// sys/class/net/NAME/phys_port_name, where the driver gives one: "p0", "pf0vf1".
   std::optional<std::string> physicalName;
   /// sys/class/net/NAME/address: "02:00:5e:10:00:01".

@@ -1,11 +1,13 @@
-#include <agent/discovery/network/Interfaces.h>
+#include <agent/discovery/BusAddress.h>
+#include <agent/discovery/network/Infiniband.h>
+#include <agent/discovery/network/NetworkDevice.h>
+#include <agent/discovery/network/NetworkQuestions.h>
 #include <agent/discovery/network/NetworkSource.h>
 #include <agent/framework/OwnNumbers.h>
 
 #include <Oru/NodeLexicon.h>
 
 #include <algorithm>
-#include <cerrno>
 #include <utility>
 #include <vector>
 
@@ -13,102 +15,66 @@ namespace agent::discovery {
 
 namespace {
 
-/// By device: what the driver of its first port that says anything says.
-using InfoByDevice = std::map<std::string, DriverInfo>;
-
-std::optional<DriverInfo> ask(SourceContext& context, Ethtool& ethtool, const std::string& interface) {
-  const std::string what = "ethtool driver info of " + interface;
-  context.doing(what);
-  const Ethtool::Answer answer = ethtool.driverInfo(interface);
-  if (answer.error == EOPNOTSUPP) {
-    context.report(what, SourceReport::Reason::Absent, "the driver does not tell");
-    return std::nullopt;
-  }
-  if (answer.error != 0) {
-    context.reportError(what, answer.error);
-    return std::nullopt;
-  }
-  std::optional<DriverInfo> info = parseDriverInfo(answer.bytes);
-  if (!info) {
-    context.report(what, SourceReport::Reason::Unreadable,
-                   "only " + std::to_string(answer.bytes.size()) + " bytes came");
-  } else if (!info->firmwareVersion) {
-    context.report(what, SourceReport::Reason::Absent, "the driver tells no firmware version");
-  }
-  return info;
+bool isVirtualFunction(SourceContext& context, const std::string& address) {
+  return isPciAddress(address) &&
+         context.root().linkTarget("sys/bus/pci/devices/" + address + "/physfn").error == 0;
 }
 
-void fill(std::optional<std::string>& known, const std::optional<std::string>& told) {
-  if (!known) {
-    known = told;
+NetworkDevices findDevices(SourceContext& context) {
+  NetworkDevices devices;
+  for (auto& [address, interfaces] : findInterfaces(context)) {
+    devices[address].interfaces = std::move(interfaces);
   }
-}
-
-/// Asks for the permanent addresses that the interfaces' attributes do not tell: of the members of a bond,
-/// for example, which all bear the bond's address.
-void askAddresses(SourceContext& context, Ethtool& ethtool, InterfacesByDevice& devices) {
-  for (auto& [address, interfaces] : devices) {
-    for (NetworkInterface& interface : interfaces) {
-      if (interface.facts.permanentAddress) {
-        continue;
-      }
-      const std::string what = "ethtool permanent address of " + interface.name;
-      context.doing(what);
-      const Ethtool::Answer answer = ethtool.permanentAddress(interface.name);
-      if (answer.error == 0) {
-        interface.facts.permanentAddress = addressText(answer.bytes);
-      } else if (answer.error != EOPNOTSUPP) {
-        context.reportError(what, answer.error);
-      }
+  for (auto& [address, adapter] : findInfiniband(context)) {
+    const bool isKnown = devices.contains(address);
+    if (!isKnown && adapter.ports.empty()) {
+      continue;
+    }
+    NetworkDevice& device = devices[address];
+    device.firmware.infiniband = std::move(adapter.firmware);
+    if (!isKnown) {
+      device.interfaces = std::move(adapter.ports);
     }
   }
+  for (auto& [address, device] : devices) {
+    device.isVirtualFunction = isVirtualFunction(context, address);
+  }
+  return devices;
 }
 
-InfoByDevice askDrivers(SourceContext& context, Ethtool& ethtool, const InterfacesByDevice& devices) {
-  InfoByDevice infos;
-  for (const auto& [address, interfaces] : devices) {
-    DriverInfo& known = infos[address];
-    for (const NetworkInterface& interface : interfaces) {
-      if (const std::optional<DriverInfo> told = ask(context, ethtool, interface.name)) {
-        fill(known.driverVersion, told->driverVersion);
-        fill(known.firmwareVersion, told->firmwareVersion);
-      }
-    }
+FoundNode portNode(const std::string& identifier, const NetworkInterface& interface) {
+  FoundNode port{Oru::NodeLexicon::NetworkPortNode, identifier, interface.name, {}, {}, {}};
+  port.setText(Oru::NodeLexicon::NameProperty, identifier);
+  const PortFacts& facts = interface.facts;
+  port.setText(PermanentAddressProperty, facts.permanentAddress);
+  port.setText(LinkTechnologyProperty, facts.linkTechnology);
+  port.setText(StateProperty, facts.state);
+  if (facts.speed) {
+    port.setValue(SpeedProperty, *facts.speed);
   }
-  return infos;
+  return port;
 }
 
-FoundNode deviceNode(const std::string& address, std::vector<NetworkInterface> interfaces,
-                     const DriverInfo& info) {
-  using namespace Oru;
-  FoundNode device{NodeLexicon::NetworkDeviceNode, address, "Network Device", {}, {}, {}};
-  device.setText(NodeLexicon::DriverVersionProperty, info.driverVersion);
-  if (info.firmwareVersion) {
-    FoundNode firmware{NodeLexicon::FirmwareNode, address + "/firmware", "Network Firmware", {}, {}, {}};
-    firmware.setText(NodeLexicon::VersionStringProperty, info.firmwareVersion);
-    device.children.push_back(std::move(firmware));
+FoundNode nodeOf(const std::string& address, const NetworkDevice& device) {
+  FoundNode node{Oru::NodeLexicon::NetworkDeviceNode, address, "Network Device", {}, {}, {}};
+  node.setText(Oru::NodeLexicon::DriverVersionProperty, device.driverVersion);
+  node.setText(DeviceDetailsProperty, deviceDetails(device.firmware.devlink));
+  if (!device.isVirtualFunction) {
+    node.children = firmwareNodes(address, device.firmware);
   }
+  std::vector<NetworkInterface> interfaces = device.interfaces;
   const std::vector<std::string> identifiers = sortAndIdentify(address, interfaces);
   for (std::size_t i = 0; i < interfaces.size(); ++i) {
-    FoundNode port{NodeLexicon::NetworkPortNode, identifiers[i], interfaces[i].name, {}, {}, {}};
-    port.setText(NodeLexicon::NameProperty, identifiers[i]);
-    const PortFacts& facts = interfaces[i].facts;
-    port.setText(PermanentAddressProperty, facts.permanentAddress);
-    port.setText(LinkTechnologyProperty, facts.linkTechnology);
-    port.setText(StateProperty, facts.state);
-    if (facts.speed) {
-      port.setValue(SpeedProperty, *facts.speed);
-    }
-    device.children.push_back(std::move(port));
+    node.children.push_back(portNode(identifiers[i], interfaces[i]));
   }
-  return device;
+  return node;
 }
 
-std::vector<FoundNode> nodesOf(const InterfacesByDevice& devices, const InfoByDevice& infos) {
+std::vector<FoundNode> nodesOf(const NetworkDevices& devices) {
   std::vector<FoundNode> nodes;
-  for (const auto& [address, interfaces] : devices) {
-    const auto info = infos.find(address);
-    nodes.push_back(deviceNode(address, interfaces, info == infos.end() ? DriverInfo{} : info->second));
+  nodes.reserve(devices.size());
+  for (const auto& [address, device] : devices) {
+    nodes.push_back(nodeOf(address, device));
   }
   // Clients that follow an association to the first device alone should find one with firmware there.
   std::stable_partition(nodes.begin(), nodes.end(), [](const FoundNode& device) {
@@ -119,21 +85,31 @@ std::vector<FoundNode> nodesOf(const InterfacesByDevice& devices, const InfoByDe
 
 }  // namespace
 
-void readNetwork(SourceContext& context, const std::shared_ptr<Ethtool>& ethtool) {
-  InterfacesByDevice devices = findInterfaces(context);
-  context.result().nodes = nodesOf(devices, {});
+void readNetwork(SourceContext& context, const std::shared_ptr<Ethtool>& ethtool,
+                 const NetlinkOpener& netlink) {
+  NetworkDevices devices = findDevices(context);
+  context.result().nodes = nodesOf(devices);
   if (devices.empty()) {
     return;
   }
-  if (ethtool == nullptr) {
-    context.report("ethtool driver info", SourceReport::Reason::Absent,
-                   "only the running kernel can tell, and it is not asked for another system root");
+  if (ethtool == nullptr && !netlink) {
+    for (const char* what : {"ethtool driver info", "devlink info"}) {
+      context.report(what, SourceReport::Reason::Absent,
+                     "only the running kernel can tell, and it is not asked for another system root");
+    }
     return;
   }
-  context.publish();  // a driver may hang
-  const InfoByDevice infos = askDrivers(context, *ethtool, devices);
-  askAddresses(context, *ethtool, devices);
-  context.result().nodes = nodesOf(devices, infos);
+  context.publish();  // a driver may hang, in this and in any later question
+  if (ethtool != nullptr) {
+    askDrivers(context, *ethtool, devices);
+    askAddresses(context, *ethtool, devices);
+    context.result().nodes = nodesOf(devices);
+  }
+  if (netlink) {
+    context.publish();
+    askDevlink(context, netlink, devices);
+    context.result().nodes = nodesOf(devices);
+  }
 }
 
 }  // namespace agent::discovery
