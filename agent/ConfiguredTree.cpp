@@ -1,8 +1,10 @@
 #include <agent/discovery/Discovery.h>
+#include <agent/discovery/events/KernelEvents.h>
 #include <agent/framework/InventoryFile.h>
 #include <agent/framework/TreeSource.h>
 
 #include <cstdlib>
+#include <memory>
 
 namespace agent {
 namespace {
@@ -30,6 +32,13 @@ NodeTree readTree(const TreeSource& source) {
     options.root = *source.systemRoot;
   }
   return discover(options);
+}
+
+std::unique_ptr<Events> eventsOf(const TreeSource& source) {
+  if (!source.isLive()) {
+    return nullptr;
+  }
+  return std::make_unique<discovery::KernelEvents>(discovery::kernelChannel());
 }
 
 }  // namespace agent

@@ -20,6 +20,12 @@ void logFailure(const char* function, unsigned int line, const std::string& mess
   ZelLog::ZelLogger::traceLevelMessage(function, file, line, category, errorLevel, nullptr, 0, 0, message);
 }
 
+void logUnwatched(const std::string& reason) {
+  logFailure(
+      __func__, __LINE__,
+      "changes of the machine show after a minute only, because its events cannot be followed: " + reason);
+}
+
 }  // namespace
 
 TreeStore& TreeStore::instance() {
@@ -39,6 +45,7 @@ std::chrono::steady_clock::time_point TreeStore::lastTick() {
 TreeStore::TreeStore(Duration lifetime, Clock clock) : lifetime_(lifetime), clock_(std::move(clock)) {}
 
 TreeStore::~TreeStore() {
+  watcher_.stop();
   waitForRereading();
 }
 
@@ -85,12 +92,14 @@ TreeStore::Reading TreeStore::read(const TreeSource& source) {
 
 /// With the lock: who asks meanwhile has nothing to go on with.
 void TreeStore::readFirst() {
-  Reading reading = read(TreeSource::fromEnvironment());
+  source_ = TreeSource::fromEnvironment();
+  Reading reading = read(source_);
   tree_ = std::move(reading.tree);
   failure_ = std::move(reading.failure);
   readAt_ = clock_();
   if (tree_) {
     isFailureLogged_ = false;
+    watch();
   } else if (noteFailure()) {
     logFailure(__func__, __LINE__, failure_);
   }
@@ -100,11 +109,11 @@ void TreeStore::readFirst() {
 /// its requests.
 void TreeStore::startRereading() {
   isRereading_ = true;
+  source_ = TreeSource::fromEnvironment();
+  watch();
   try {
     const SignalsBlocked blocked;
-    std::thread([this, source = TreeSource::fromEnvironment(), old = tree_] {
-      reread(source, old);
-    }).detach();
+    std::thread([this, source = source_, old = tree_] { reread(source, old); }).detach();
   } catch (const std::exception& error) {
     isRereading_ = false;
     readAt_ = clock_();
@@ -114,6 +123,37 @@ void TreeStore::startRereading() {
           std::string("the inventory cannot be read again: no thread could be started: ") + error.what());
     }
   }
+}
+
+/// With the lock.
+void TreeStore::watch() {
+  if (isWatched_) {
+    return;
+  }
+  try {
+    std::unique_ptr<Events> events = eventsOf(source_);
+    if (events) {
+      isWatched_ = true;
+      watcher_.start(std::move(events), {[this] { readAfterChange(); }, logUnwatched});
+    }
+  } catch (const std::exception& error) {
+    isWatched_ = true;
+    logUnwatched(error.what());
+  }
+}
+
+/// In the watcher's thread. A reading under way may have begun before the change.
+void TreeStore::readAfterChange() {
+  std::unique_lock lock(mutex_);
+  reread_.wait(lock, [this] { return !isRereading_; });
+  if (!tree_ || !source_.isLive()) {
+    return;
+  }
+  const TreeSource source = source_;
+  const Tree old = tree_;
+  isRereading_ = true;
+  lock.unlock();
+  reread(source, old);
 }
 
 void TreeStore::reread(const TreeSource& source, const Tree& old) {

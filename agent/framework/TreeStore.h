@@ -5,6 +5,7 @@
 
 #include <agent/framework/NodeTree.h>
 #include <agent/framework/TreeSource.h>
+#include <agent/framework/TreeWatcher.h>
 
 #include <chrono>
 #include <condition_variable>
@@ -32,7 +33,7 @@ class TreeStore {
   static std::chrono::steady_clock::time_point lastTick();
 
   explicit TreeStore(Duration lifetime = usualLifetime, Clock clock = lastTick);
-  /// As `waitForRereading`.
+  /// Follows the source's events no more, and waits for the re-reading under way.
   ~TreeStore();
   TreeStore(const TreeStore&) = delete;
   TreeStore& operator=(const TreeStore&) = delete;
@@ -42,6 +43,11 @@ class TreeStore {
   /// the source read again by a thread of the store's own, one at a time, and returns the tree that there is.
   /// The new tree replaces it as a whole, unless it is equal. Where it cannot be read the earlier tree stays,
   /// and a call after the same time tries again.
+  ///
+  /// Where the source has events (a live machine's, `eventsOf`), a thread of the store's own follows them
+  /// from the first tree on, and has the source read again when it changed. Where they cannot be followed,
+  /// that is logged, once, and the lifetime alone decides. A process that forks goes on without them in the
+  /// child.
   ///
   /// Throws `Oru::InstrumentationException` with the reason where there is no tree because the source could
   /// not be read. The failure stands as long as a tree would: calls fail the same way without reading, and
@@ -67,6 +73,8 @@ class TreeStore {
   static Reading read(const TreeSource& source);
   void readFirst();
   void startRereading();
+  void watch();
+  void readAfterChange();
   void reread(const TreeSource& source, const Tree& old);
   void finishRereading(const Tree& old, Reading reading);
   bool noteFailure();
@@ -75,11 +83,14 @@ class TreeStore {
   const Clock clock_;
   std::mutex mutex_;  ///< guards what follows; held while the first tree is read
   Tree tree_;
+  TreeSource source_;                             ///< what was read last, or is being read
   std::string failure_;                           ///< why there is no tree
   std::chrono::steady_clock::time_point readAt_;  ///< when `tree_` or `failure_` came
   bool isRereading_ = false;
   bool isFailureLogged_ = false;
+  bool isWatched_ = false;          ///< `watcher_` was started
   std::condition_variable reread_;  ///< the re-reading ended
+  TreeWatcher watcher_;
 };
 
 }  // namespace agent

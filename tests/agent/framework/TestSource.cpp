@@ -11,6 +11,8 @@ namespace {
 
 std::mutex mutex;
 std::function<agent::NodeTree()> currentSource;
+std::function<std::unique_ptr<agent::Events>()> currentEvents;
+bool isInventory = false;
 std::vector<agent::testing::LoggedMessage> logged;
 
 void log(bool isTrace, const std::string& category, int level, const char* file, const std::string& message) {
@@ -23,7 +25,8 @@ void log(bool isTrace, const std::string& category, int level, const char* file,
 namespace agent {
 
 TreeSource TreeSource::fromEnvironment() {
-  return {};
+  const std::lock_guard lock(mutex);
+  return isInventory ? TreeSource{"inventory.json", {}} : TreeSource{};
 }
 
 NodeTree readTree(const TreeSource&) {
@@ -35,11 +38,30 @@ NodeTree readTree(const TreeSource&) {
   return source ? source() : NodeTree();
 }
 
+std::unique_ptr<Events> eventsOf(const TreeSource& source) {
+  std::function<std::unique_ptr<Events>()> events;
+  {
+    const std::lock_guard lock(mutex);
+    events = currentEvents;
+  }
+  return events && source.isLive() ? events() : nullptr;
+}
+
 namespace testing {
 
 void setSource(std::function<NodeTree()> source) {
   const std::lock_guard lock(mutex);
   currentSource = std::move(source);
+}
+
+void setEvents(std::function<std::unique_ptr<Events>()> events) {
+  const std::lock_guard lock(mutex);
+  currentEvents = std::move(events);
+}
+
+void setInventory(bool isOne) {
+  const std::lock_guard lock(mutex);
+  isInventory = isOne;
 }
 
 std::vector<LoggedMessage> takeLog() {
