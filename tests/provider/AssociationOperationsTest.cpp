@@ -9,7 +9,6 @@ namespace {
 using namespace associations;  // NOLINT(google-build-using-namespace): the tests' own vocabulary
 using testing::Contains;
 using testing::ElementsAre;
-using testing::ElementsAreArray;
 using testing::IsEmpty;
 
 using AssociationOperations = AssociationRequests;

@@ -13,7 +13,6 @@ namespace {
 
 using namespace associations;  // NOLINT(google-build-using-namespace): the tests' own vocabulary
 using namespace Oru::SoftwareInventoryProfileProvider;  // NOLINT(google-build-using-namespace): four of it
-using testing::Contains;
 using testing::StartsWith;
 
 struct Installed {

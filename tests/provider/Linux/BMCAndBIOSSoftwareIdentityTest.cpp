@@ -17,7 +17,6 @@ using Oru::SoftwareInventoryProfileProvider::BIOSSoftwareIdentity;
 using Oru::SoftwareInventoryProfileProvider::BMCSoftwareIdentity;
 using testing::Contains;
 using testing::ElementsAre;
-using testing::Not;
 
 struct BMC {
   using Resolver = BMCSoftwareIdentity;
