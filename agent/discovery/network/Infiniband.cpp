@@ -29,7 +29,7 @@ std::vector<NetworkInterface> readPorts(SourceContext& context, const std::strin
       continue;
     }
     NetworkInterface port;
-    port.name = adapter + "/" + name;
+    port.name = within(adapter, name);
     port.hasInterface = false;
     port.port = *number;
     const std::string path = within(folder, name);

@@ -14,7 +14,7 @@ namespace agent::discovery {
 struct InfinibandAdapter {
   std::optional<std::string> firmware;  ///< sys/class/infiniband/NAME/fw_ver
   /// Its own ports; `hasInterface` is false for each. Described by the kernel's names of adapter and port:
-  /// "mlx5_0/1".
+  /// "hca0/1".
   std::vector<NetworkInterface> ports;
 };
 

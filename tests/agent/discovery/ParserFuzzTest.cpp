@@ -1,4 +1,5 @@
 // Every parser on texts that nobody wrote, the same ones in each run.
+#include "DevlinkBytes.h"
 #include "Machine.h"
 #include "SmbiosBuilder.h"
 
@@ -10,7 +11,9 @@
 #include <agent/discovery/engine/EngineVersions.h>
 #include <agent/discovery/esrt/ResourceEntry.h>
 #include <agent/discovery/ipmi/DeviceId.h>
+#include <agent/discovery/network/Devlink.h>
 #include <agent/discovery/network/Interfaces.h>
+#include <agent/discovery/network/Netlink.h>
 #include <agent/discovery/processor/Microcode.h>
 #include <agent/discovery/storage/AtaPage.h>
 #include <agent/discovery/storage/ScsiPlace.h>
@@ -144,6 +147,25 @@ TEST(ParserFuzz, DriverInfoIsReadWithinItsBytes) {
          if (info && info->firmwareVersion) {
            ASSERT_FALSE(info->firmwareVersion->empty());
            ASSERT_EQ(meaningful(*info->firmwareVersion), info->firmwareVersion);
+         }
+       });
+}
+
+TEST(ParserFuzz, NetlinkIsReadWithinItsBytesAndItsWalkEnds) {
+  feed({familyAnswer(1) + errorMessage(2, 19),
+        message(devlinkFamily, 2,
+                generic(51) + devlinkAttributes("fixed board.id=K9;running fw=1;stored fw=2"))},
+       [](std::string_view bytes) {
+         std::size_t left = bytes.size() + 1;
+         while (const auto message = netlink::takeMessage(bytes)) {
+           ASSERT_LT(bytes.size(), left);
+           left = bytes.size();
+           ASSERT_GE(netlink::errorOf(message->payload), 0);
+           if (const auto answer = netlink::parseGeneric(message->payload)) {
+             for (const DevlinkVersion& version : parseDevlinkInfo(answer->attributes).running) {
+               ASSERT_EQ(meaningful(version.version), version.version);
+             }
+           }
          }
        });
 }
