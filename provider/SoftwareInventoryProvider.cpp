@@ -4,10 +4,9 @@
 #include <Trace.h>
 #include <cmpi/cmpimacs.h>
 
-#include <atomic>
-#include <cstring>
 #include <exception>
 
+#include "Answers.h"
 #include "CMPIBIOSSoftwareIdentity.h"
 #include "CMPIBMCSoftwareIdentity.h"
 #include "CMPIInstalledSoftwareIdentity.h"
@@ -15,8 +14,6 @@
 #include "CMPISoftwareIdentity.h"
 
 namespace Oru::SoftwareInventoryProfileProvider {
-
-const CMPIBroker* broker = nullptr;
 
 namespace {
 
@@ -33,36 +30,6 @@ enum ClassId : std::uint16_t {
   BIOSSoftwareIdentityClass = 118,
   UnknownClass = 255,
 };
-
-/// What a null among the answers does to the object manager. The small-footprint broker ends the provider's
-/// process on one, so that nulls are left out for it; every other gets them.
-std::atomic<bool> nullsAreLeftOut{false};
-
-/// The name by which the small-footprint broker is known in its function table.
-constexpr const char* smallFootprintBroker = "RequestHandler";
-
-// Object managers may call a factory again while requests run.
-void storeBroker(const CMPIBroker* newBroker) {
-  const char* name = newBroker != nullptr && newBroker->bft != nullptr ? newBroker->bft->brokerName : nullptr;
-  nullsAreLeftOut.store(name != nullptr && std::strcmp(name, smallFootprintBroker) == 0,
-                        std::memory_order_relaxed);
-  std::atomic_ref(broker).store(newBroker, std::memory_order_relaxed);
-}
-const CMPIBroker* currentBroker() {
-  return std::atomic_ref(broker).load(std::memory_order_relaxed);
-}
-
-/// Hands an object on, a null like any other where the object manager bears it.
-void deliver(const CMPIResult* result, const CMPIObjectPath* path) {
-  if (path != nullptr || !nullsAreLeftOut.load(std::memory_order_relaxed)) {
-    CMReturnObjectPath(result, path);
-  }
-}
-void deliver(const CMPIResult* result, const CMPIInstance* instance) {
-  if (instance != nullptr || !nullsAreLeftOut.load(std::memory_order_relaxed)) {
-    CMReturnInstance(result, instance);
-  }
-}
 
 CMPIStatus statusOf(CMPIrc code) {
   return {code, nullptr};
@@ -130,6 +97,17 @@ bool associate(unsigned short classId, const CMPIContext* context, const CMPIObj
   }
 }
 
+/// The names of all software. What a name takes is put in the place of its calls: the calls are a good part
+/// of it.
+[[gnu::flatten]] void nameSoftware(const CMPIContext* context, const CMPIResult* result,
+                                   const CMPIObjectPath* classPath) {
+  walk<CMPISoftwareIdentity>(context, classPath, [result](CMPISoftwareIdentity& adapter) {
+    if (const CMPIObjectPath* path = adapter.getObjectPath()) {
+      CMReturnObjectPath(result, path);
+    }
+  });
+}
+
 /// All that a function does which touches neither its arguments nor the result: it says that it was invoked.
 CMPIStatus answerAtOnce(CMPIrc code, CallSite site = CallSite::here()) {
   beginRequest();
@@ -170,11 +148,7 @@ CMPIStatus SoftwareInventory_EnumInstanceNames(CMPIInstanceMI*, const CMPIContex
                                                const CMPIResult* result, const CMPIObjectPath* classPath) {
   return answer(classPath, [&](unsigned short classId, CMPIStatus& status) {
     if (classId == SoftwareIdentityClass || classId == SecondSoftwareIdentityClass) {
-      walk<CMPISoftwareIdentity>(context, classPath, [&](CMPISoftwareIdentity& adapter) {
-        if (const CMPIObjectPath* path = adapter.getObjectPath()) {
-          CMReturnObjectPath(result, path);
-        }
-      });
+      nameSoftware(context, result, classPath);
     } else if (!walkAssociation(classId, context, classPath,
                                 [&](auto& adapter) { deliver(result, adapter.getObjectPath()); })) {
       status.rc = CMPI_RC_ERR_INVALID_CLASS;
