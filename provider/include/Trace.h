@@ -363,15 +363,19 @@ class ParameterScope {
 /// line, as this helper's own event, then ENTERING for the function.
 inline void markProviderEntry(const std::string& logger, const char* function = __builtin_FUNCTION(),
                               const char* file = __builtin_FILE(), unsigned int line = __builtin_LINE()) {
-  trace_detail::emit(logger, routineLevel, [] { return traceSeparator; });
-  trace_detail::emitEvent(LogPoint(logger, {function, file, line}), routineLevel, ENTERING);
+  if (trace_detail::mayBeOn(routineLevel)) {
+    trace_detail::emit(logger, routineLevel, [] { return traceSeparator; });
+    trace_detail::emitEvent(LogPoint(logger, {function, file, line}), routineLevel, ENTERING);
+  }
 }
 
 /// Its mirror at the end: EXITING, then the separator line.
 inline void markProviderExit(const std::string& logger, const char* function = __builtin_FUNCTION(),
                              const char* file = __builtin_FILE(), unsigned int line = __builtin_LINE()) {
-  trace_detail::emitEvent(LogPoint(logger, {function, file, line}), routineLevel, EXITING);
-  trace_detail::emit(logger, routineLevel, [] { return traceSeparator; });
+  if (trace_detail::mayBeOn(routineLevel)) {
+    trace_detail::emitEvent(LogPoint(logger, {function, file, line}), routineLevel, EXITING);
+    trace_detail::emit(logger, routineLevel, [] { return traceSeparator; });
+  }
 }
 
 }  // namespace Oru::SoftwareInventoryProfileProvider
