@@ -167,6 +167,24 @@ TEST(NetworkMachine, WhatDevlinkDoesNotAnswerIsReported) {
   }
 }
 
+TEST(NetworkMachine, AfterAnAnswerThatDoesNotComeDevlinkIsNotAskedAgain) {
+  for (const int error : {ETIMEDOUT, EIO}) {
+    Machine machine(functions);
+    machine.remove("sys/devices/pci0000:00/0000:03:02.0/physfn");
+    const NodeTree tree = discovered(
+        machine, {},
+        devlinkTelling({{"pci/0000:03:00.0", {"", error}}, {"pci/0000:03:02.0", {"running fw=1.2", 0}}}));
+    EXPECT_EQ(described(tree, "Network Firmware") == NodeTree::none, error == ETIMEDOUT);
+  }
+}
+
+TEST(NetworkMachine, AnotherRootIsNotAskedByDevlinkAndSaysSo) {
+  const Machine machine(functions);
+  const auto report = reportOn(discoverAt(machine), "network", "devlink info");
+  ASSERT_TRUE(report);
+  EXPECT_EQ(report->reason, SourceReport::Reason::Absent);
+}
+
 TEST(NetworkMachine, ADeviceThatIsNoneOfDevlinkIsNothingToReport) {
   const Machine machine(functions);
   EXPECT_FALSE(reportOn(discovered(machine, {}, devlinkTelling({})), "network", "0000:03:00.0"));
@@ -231,6 +249,12 @@ TEST(NetworkMachine, InfinibandVersionOfZeroesIsAbsent) {
   Machine machine(infiniband);
   machine.add("sys/class/infiniband/hca0/fw_ver = 0.0.0");
   EXPECT_EQ(described(discovered(machine, {}, devlinkTelling({})), "Network Firmware"), NodeTree::none);
+}
+
+TEST(NetworkMachine, InfinibandAdapterWithoutPortsIsNoDevice) {
+  Machine machine(infiniband);
+  machine.remove("sys/class/infiniband/hca0/ports");
+  EXPECT_EQ(shown(discovered(machine, {}, devlinkTelling({}))), "40 Computer System\n");
 }
 
 TEST(InfinibandPortState, IsThatOfTheLogicalPort) {
