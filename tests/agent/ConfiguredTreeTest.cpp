@@ -8,6 +8,8 @@
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
+#include <memory>
+#include <optional>
 #include <string>
 
 namespace agent {
@@ -69,6 +71,15 @@ TEST_F(ConfiguredTree, IsReadFromAnInventoryBeforeASystemRoot) {
   setenv("ORU_INVENTORY", (folder / "machine.json").c_str(), 1);
   setenv("ORU_SYSTEM_ROOT", folder.c_str(), 1);
   EXPECT_EQ(readTree(TreeSource::fromEnvironment()), saved);
+}
+
+TEST_F(ConfiguredTree, LiveMachineAloneHasEvents) {
+  const std::unique_ptr<Events> events = eventsOf({});
+  ASSERT_NE(events, nullptr);
+  events->stop();
+  EXPECT_FALSE(events->waitForChange());
+  EXPECT_EQ(eventsOf({folder / "machine.json", std::nullopt}), nullptr);
+  EXPECT_EQ(eventsOf({std::nullopt, folder}), nullptr);
 }
 
 TEST_F(ConfiguredTree, FailsWithTheReasonWhereTheInventoryIsBroken) {
