@@ -143,9 +143,14 @@ Outcome<std::string> SystemRoot::read(std::string_view path, std::size_t limit) 
   if (!S_ISREG(status.st_mode)) {
     return {std::nullopt, S_ISDIR(status.st_mode) ? EISDIR : EINVAL};
   }
-  std::string content(limit + 1, '\0');  // one more, to see what is longer
+  constexpr std::size_t block = std::size_t{64} * 1024;
+  const std::size_t most = limit + 1;                // one more, to see what is longer
+  std::string content(std::min(most, block), '\0');  // files are far smaller than their limits
   std::size_t length = 0;
-  while (length < content.size()) {
+  while (length < most) {
+    if (length == content.size()) {
+      content.resize(std::min(most, 2 * length));
+    }
     const ssize_t count = ::read(file.get(), content.data() + length, content.size() - length);
     if (count < 0 && errno == EINTR) {
       continue;

@@ -6,8 +6,8 @@
 // Prints lines: look NAME MICROSECONDS NODES, of the whole (by that name) and of each source the shortest of
 // so many looks. Each look is the first of its process.
 #include <agent/discovery/SourceRunner.h>
+#include <agent/discovery/Sources.h>
 #include <bench/discovery/GeneratedMachine.h>
-#include <bench/discovery/Sources.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
@@ -92,7 +92,7 @@ std::size_t count(const std::vector<FoundNode>& nodes) {
 void measure(const agent::DiscoveryOptions& options, int looks) {
   const agent::discovery::SystemRoot root(options.root);
   show("whole", looks, [&] { return agent::discover(options).size(); });
-  for (const agent::discovery::Source& source : bench::sourcesOf(options)) {
+  for (const agent::discovery::Source& source : agent::discovery::makeSources(options, root)) {
     show(source.name, looks, [&] {
       const auto results = agent::discovery::runSources({source}, root, options.deadline);
       return count(results.front().nodes) + results.front().declared.size();

@@ -1,3 +1,4 @@
+#include <agent/discovery/Sources.h>
 #include <agent/discovery/dmi/DmiSource.h>
 #include <agent/discovery/drivers/DriverSource.h>
 #include <agent/discovery/engine/EngineSource.h>
@@ -9,16 +10,24 @@
 #include <agent/discovery/processor/ProcessorSource.h>
 #include <agent/discovery/storage/StorageSource.h>
 #include <agent/discovery/tpm/TpmSource.h>
-#include <bench/discovery/Sources.h>
 
-namespace bench {
+#include <utility>
 
-std::vector<agent::discovery::Source> sourcesOf(const agent::DiscoveryOptions& options) {
-  using namespace agent::discovery;
-  const bool live = SystemRoot(options.root).isLive();
-  const std::shared_ptr<Ethtool> ethtool = live ? makeKernelEthtool() : options.ethtool;
-  const NetlinkOpener netlink = live ? kernelNetlink() : options.netlink;
-  const IpmiOpener ipmi = live ? kernelIpmi() : options.ipmi;
+namespace agent::discovery {
+
+std::vector<Source> makeSources(const DiscoveryOptions& options, const SystemRoot& root) {
+  std::shared_ptr<Ethtool> ethtool = options.ethtool;
+  if (ethtool == nullptr && root.isLive()) {
+    ethtool = makeKernelEthtool();
+  }
+  NetlinkOpener netlink = options.netlink;
+  if (!netlink && root.isLive()) {
+    netlink = kernelNetlink();
+  }
+  IpmiOpener ipmi = options.ipmi;
+  if (!ipmi && root.isLive()) {
+    ipmi = kernelIpmi();
+  }
   return {
       {"host", readHost},
       {"dmi", readDmi},
@@ -34,4 +43,4 @@ std::vector<agent::discovery::Source> sourcesOf(const agent::DiscoveryOptions& o
   };
 }
 
-}  // namespace bench
+}  // namespace agent::discovery
