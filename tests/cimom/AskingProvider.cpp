@@ -6,6 +6,7 @@
 #include <cmpi/cmpift.h>
 #include <cmpi/cmpimacs.h>
 
+#include <atomic>
 #include <string>
 
 namespace {
@@ -14,7 +15,8 @@ using association_test::classOf;
 using association_test::nameOf;
 using association_test::textOf;
 
-const CMPIBroker* broker = nullptr;
+// Each factory sets it, also while requests run.
+std::atomic<const CMPIBroker*> broker{nullptr};
 
 constexpr CMPIStatus ok{CMPI_RC_OK, nullptr};
 
@@ -46,7 +48,7 @@ std::string listed(const CMPIEnumeration* found) {
 /// What other providers told about the firmware or, for the name "class", about all firmware.
 std::string told(const CMPIContext* context, const std::string& question) {
   CMPIStatus status = ok;
-  const CMPIBrokerFT& calls = *broker->bft;
+  const CMPIBrokerFT& calls = *broker.load()->bft;
   const char* properties[] = {"Number", nullptr};
   const CMPIObjectPath* source = firmware();
   CMPIContext* marked = context->ft->clone(context, nullptr);

@@ -6,6 +6,7 @@
 #include <cmpi/cmpift.h>
 #include <cmpi/cmpimacs.h>
 
+#include <atomic>
 #include <stdexcept>
 #include <string>
 #include <string_view>
@@ -17,7 +18,8 @@ using association_test::classOf;
 using association_test::nameOf;
 using association_test::textOf;
 
-const CMPIBroker* broker = nullptr;
+// Each factory sets it, also while requests run.
+std::atomic<const CMPIBroker*> broker{nullptr};
 
 constexpr CMPIStatus ok{CMPI_RC_OK, nullptr};
 constexpr int crowdSize = 20000;
@@ -71,7 +73,7 @@ CMPIStatus failure(CMPIrc code, const char* message) {
 }
 
 void note(const std::string& call) {
-  broker->eft->logMessage(broker, CMPI_SEV_INFO, "call", call.c_str(), nullptr);
+  broker.load()->eft->logMessage(broker, CMPI_SEV_INFO, "call", call.c_str(), nullptr);
 }
 std::string argument(const char* name, const char* text) {
   return text == nullptr ? "" : " " + std::string(name) + "=" + text;
@@ -179,7 +181,7 @@ CMPIStatus ended(std::string_view className, const Answer& answer) {
 /// Asks what it was asked itself.
 CMPIStatus askAgain(const CMPIContext* context, const CMPIObjectPath* path, const char* association) {
   CMPIStatus status = ok;
-  broker->bft->associatorNames(broker, context, path, association, nullptr, "Owner", nullptr, &status);
+  broker.load()->bft->associatorNames(broker, context, path, association, nullptr, "Owner", nullptr, &status);
   return status;
 }
 

@@ -15,7 +15,8 @@
 
 namespace {
 
-const CMPIBroker* broker = nullptr;
+// Each factory sets it, also while requests run.
+std::atomic<const CMPIBroker*> broker{nullptr};
 std::atomic<int> met = 0;
 
 constexpr CMPIStatus ok{CMPI_RC_OK, nullptr};
@@ -173,7 +174,7 @@ CMPIStatus enumerate(const CMPIContext* context, const CMPIResult* result, const
     return answer.done();
   }
   if (className == "TEST_Logging")
-    broker->eft->logMessage(broker, CMPI_SEV_ERROR, "part", "said by the provider", nullptr);
+    broker.load()->eft->logMessage(broker, CMPI_SEV_ERROR, "part", "said by the provider", nullptr);
   if (className == "TEST_SubThing" || className == "TEST_Logging" || className == "TEST_Untidy" ||
       className == "TEST_Staying") {
     answer.give(className.c_str(), "s", 4);
