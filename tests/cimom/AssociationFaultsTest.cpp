@@ -20,8 +20,8 @@ class AssociationFaults : public Linked {
   /// All four operations on the class fail like this; the description says why.
   void expectFailed(const char* className, CMPIrc code, const std::string& reason, std::size_t delivered) {
     const Query query{.associationClass = className};
-    for (const Answer& answer : {associatorNames(server_, query), associators(server_, query),
-                                 referenceNames(server_, query), references(server_, query)}) {
+    for (const Answer& answer : {associatorNames(serverPath, query), associators(serverPath, query),
+                                 referenceNames(serverPath, query), references(serverPath, query)}) {
       EXPECT_EQ(answer.outcome.status.code, code);
       EXPECT_THAT(answer.outcome.status.description, HasSubstr(reason));
       EXPECT_FALSE(answer.outcome.done);
@@ -56,15 +56,15 @@ TEST_F(AssociationFaults, aMissingLibraryIsAFailure) {
 }
 
 TEST_F(AssociationFaults, nullsAreLeftOut) {
-  EXPECT_THAT(ends(server_, {.associationClass = "TEST_FaultNulls"}), ElementsAre("TEST_Software nulls"));
-  EXPECT_EQ(links(server_, {.associationClass = "TEST_FaultNulls"}).size(), 1U);
+  EXPECT_THAT(ends(serverPath, {.associationClass = "TEST_FaultNulls"}), ElementsAre("TEST_Software nulls"));
+  EXPECT_EQ(links(serverPath, {.associationClass = "TEST_FaultNulls"}).size(), 1U);
   expectComplaints("TEST_FaultNulls", "with 1 nulls");
 }
 
 TEST_F(AssociationFaults, aMissingDoneMarkerIsSaid) {
   const Query query{.associationClass = "TEST_FaultNoDone"};
-  for (const Answer& answer : {associatorNames(server_, query), associators(server_, query),
-                               referenceNames(server_, query), references(server_, query)}) {
+  for (const Answer& answer : {associatorNames(serverPath, query), associators(serverPath, query),
+                               referenceNames(serverPath, query), references(serverPath, query)}) {
     EXPECT_EQ(answer.outcome.status.code, CMPI_RC_OK);
     EXPECT_FALSE(answer.outcome.done);
     EXPECT_EQ(answer.outcome.delivered, 1U);
@@ -73,14 +73,15 @@ TEST_F(AssociationFaults, aMissingDoneMarkerIsSaid) {
 }
 
 TEST_F(AssociationFaults, pathsForInstancesAreLeftOut) {
-  EXPECT_THAT(ends(server_, {.associationClass = "TEST_FaultStrange"}), ElementsAre("TEST_Software strange"));
-  EXPECT_EQ(links(server_, {.associationClass = "TEST_FaultStrange"}).size(), 1U);
+  EXPECT_THAT(ends(serverPath, {.associationClass = "TEST_FaultStrange"}),
+              ElementsAre("TEST_Software strange"));
+  EXPECT_EQ(links(serverPath, {.associationClass = "TEST_FaultStrange"}).size(), 1U);
   expectComplaints("TEST_FaultStrange", "1 objects that nobody asked for, the first of class TEST_Port");
 }
 
 // The first failure is the exception, and everybody is asked.
 TEST_F(AssociationFaults, doNotKeepOthersFromBeingAsked) {
-  const Answer answer = associatorNames(server_, {.associationClass = "TEST_Fault"});
+  const Answer answer = associatorNames(serverPath, {.associationClass = "TEST_Fault"});
   EXPECT_EQ(answer.outcome.status.code, CMPI_RC_ERR_FAILED);
   EXPECT_THAT(answer.outcome.status.description, HasSubstr("something broke"));
   EXPECT_FALSE(answer.outcome.done);
@@ -90,11 +91,11 @@ TEST_F(AssociationFaults, doNotKeepOthersFromBeingAsked) {
 }
 
 TEST_F(AssociationFaults, aRequestThatAsksItselfIsEnded) {
-  const Answer answer = associatorNames(server_, {.associationClass = "TEST_Endless"});
+  const Answer answer = associatorNames(serverPath, {.associationClass = "TEST_Endless"});
   EXPECT_EQ(answer.outcome.status.code, CMPI_RC_ERR_FAILED);
   EXPECT_THAT(answer.outcome.status.description, HasSubstr("more than 16 calls deep"));
   EXPECT_EQ(calls().size(), static_cast<std::size_t>(cimom::Nesting::deepest));
-  EXPECT_THAT(ends(port_, {.associationClass = "TEST_Serves"}), ElementsAre("TEST_Firmware f1"));
+  EXPECT_THAT(ends(portPath, {.associationClass = "TEST_Serves"}), ElementsAre("TEST_Firmware f1"));
 }
 
 class AssociationUpcalls : public Linked {
@@ -143,11 +144,11 @@ TEST_F(AssociationThreads, mayAskForRolesAtOnce) {
     threads.emplace_back([this, &wrong] {
       for (int round = 0; round < rounds; ++round) {
         const bool right =
-            associatorNames(firmware_, {.associationClass = "TEST_Dependency", .role = "Dependent"})
+            associatorNames(firmwarePath, {.associationClass = "TEST_Dependency", .role = "Dependent"})
                     .outcome.delivered == 3 &&
-            associators(server_, {.associationClass = "TEST_Holds"}).outcome.delivered == 4 &&
-            references(firmware_, {.associationClass = "TEST_Peer", .role = "Dependent"}).outcome.delivered ==
-                1;
+            associators(serverPath, {.associationClass = "TEST_Holds"}).outcome.delivered == 4 &&
+            references(firmwarePath, {.associationClass = "TEST_Peer", .role = "Dependent"})
+                    .outcome.delivered == 1;
         wrong += right ? 0 : 1;
       }
     });

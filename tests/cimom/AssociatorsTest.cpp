@@ -13,14 +13,14 @@ using testing::IsEmpty;
 class Associators : public Linked {};
 
 TEST_F(Associators, areTheFarEndsInBothDirections) {
-  EXPECT_THAT(ends(controller_, {.associationClass = "TEST_Runs"}), ElementsAre("TEST_Firmware f1"));
-  EXPECT_THAT(ends(firmware_, {.associationClass = "TEST_Runs"}), ElementsAre("TEST_Controller c"));
-  EXPECT_THAT(ends(firmware_, {.associationClass = "test_INSTALLED"}),
+  EXPECT_THAT(ends(controllerPath, {.associationClass = "TEST_Runs"}), ElementsAre("TEST_Firmware f1"));
+  EXPECT_THAT(ends(firmwarePath, {.associationClass = "TEST_Runs"}), ElementsAre("TEST_Controller c"));
+  EXPECT_THAT(ends(firmwarePath, {.associationClass = "test_INSTALLED"}),
               ElementsAre("TEST_System s", "TEST_Controller c"));
   EXPECT_THAT(
-      ends(server_, {.associationClass = "TEST_Installed"}),
+      ends(serverPath, {.associationClass = "TEST_Installed"}),
       ElementsAre("TEST_Firmware f1", "TEST_Firmware f2", R"(TEST_Software d "quoted" \ and, more=)"));
-  EXPECT_THAT(ends(driver_, {.associationClass = "TEST_Installed"}), ElementsAre("TEST_System s"));
+  EXPECT_THAT(ends(driverPath, {.associationClass = "TEST_Installed"}), ElementsAre("TEST_System s"));
   EXPECT_THAT(complaints(), IsEmpty());
 }
 
@@ -34,17 +34,17 @@ TEST_F(Associators, takePathsWithTheirNamespace) {
 // Each registered class is asked with its own name, in the order of the schema. TEST_HoldsKind and
 // TEST_Unregistered are not registered; abstract classes are not asked.
 TEST_F(Associators, ofAnAncestorComeFromEveryClassBelowIt) {
-  EXPECT_THAT(associatorNames(firmware_, {.associationClass = "TEST_Dependency"}).objects,
+  EXPECT_THAT(associatorNames(firmwarePath, {.associationClass = "TEST_Dependency"}).objects,
               ElementsAre("TEST_Controller c", "TEST_Port p", "TEST_Firmware f2", "TEST_Firmware f3"));
   EXPECT_THAT(calls(), ElementsAre("associatorNames of=TEST_Runs", "associatorNames of=TEST_Serves",
                                    "associatorNames of=TEST_Holds", "associatorNames of=TEST_HoldsMore",
                                    "associatorNames of=TEST_Peer"));
-  EXPECT_THAT(ends(firmware_, {.associationClass = "TEST_ElementSoftware"}),
+  EXPECT_THAT(ends(firmwarePath, {.associationClass = "TEST_ElementSoftware"}),
               ElementsAre("TEST_Controller c", "TEST_Port p"));
 }
 
 TEST_F(Associators, ofNoClassComeFromEveryClass) {
-  const Answer answer = associatorNames(port_);
+  const Answer answer = associatorNames(portPath);
   EXPECT_THAT(answer.objects, ElementsAre("TEST_Firmware f1"));
   std::vector<std::string> expected;
   for (const char* name :
@@ -56,18 +56,18 @@ TEST_F(Associators, ofNoClassComeFromEveryClass) {
 }
 
 TEST_F(Associators, areNoneWhereNobodyIsRegistered) {
-  EXPECT_THAT(ends(server_, {.associationClass = "TEST_Unregistered"}), IsEmpty());
-  EXPECT_THAT(ends(server_, {.associationClass = "TEST_HoldsKind"}), IsEmpty());
+  EXPECT_THAT(ends(serverPath, {.associationClass = "TEST_Unregistered"}), IsEmpty());
+  EXPECT_THAT(ends(serverPath, {.associationClass = "TEST_HoldsKind"}), IsEmpty());
   EXPECT_THAT(calls(), IsEmpty());
 }
 
 // TEST_Holds delivers one object twice, and the object of TEST_HoldsMore, which is asked for it again.
 TEST_F(Associators, areNotRepeatedByAnotherClass) {
-  EXPECT_THAT(ends(server_, {.associationClass = "TEST_Holds"}),
+  EXPECT_THAT(ends(serverPath, {.associationClass = "TEST_Holds"}),
               ElementsAre("TEST_Firmware f2", "TEST_Firmware f2", "TEST_Port kind", "TEST_Port more"));
-  EXPECT_THAT(ends(server_, {.associationClass = "TEST_Dependency"}),
+  EXPECT_THAT(ends(serverPath, {.associationClass = "TEST_Dependency"}),
               ElementsAre("TEST_Firmware f2", "TEST_Firmware f2", "TEST_Port kind", "TEST_Port more"));
-  const Answer all = associatorNames(server_);
+  const Answer all = associatorNames(serverPath);
   EXPECT_THAT(all.objects, testing::Contains("TEST_Firmware f2").Times(1));
   EXPECT_THAT(all.objects, testing::Contains("TEST_Port more").Times(1));
   EXPECT_EQ(all.outcome.delivered, all.objects.size());
@@ -83,13 +83,13 @@ TEST_F(Associators, areHeldAgainstManyInLittleTime) {
 
 TEST_F(Associators, haveThePropertiesAskedFor) {
   std::size_t count = 0;
-  manager_.associators(firmware_, {.associationClass = "TEST_Runs"}, {{"nothing"}},
+  manager_.associators(firmwarePath, {.associationClass = "TEST_Runs"}, {{"nothing"}},
                        [&count](const cimom::Instance& instance) {
                          EXPECT_EQ(instance.find("Number"), nullptr);
                          count += instance.properties().size();
                          return true;
                        });
-  manager_.associators(firmware_, {.associationClass = "TEST_Runs"}, {{"NUMBER"}},
+  manager_.associators(firmwarePath, {.associationClass = "TEST_Runs"}, {{"NUMBER"}},
                        [&count](const cimom::Instance& instance) {
                          EXPECT_NE(instance.find("Number"), nullptr);
                          count += instance.properties().size();
@@ -103,7 +103,7 @@ TEST_F(Associators, haveThePropertiesAskedFor) {
 TEST_F(Associators, endWhereTheSinkHasEnough) {
   std::size_t count = 0;
   const auto outcome =
-      manager_.associatorNames(server_, {.associationClass = ""}, [&count](const cimom::ObjectPath&) {
+      manager_.associatorNames(serverPath, {.associationClass = ""}, [&count](const cimom::ObjectPath&) {
         ++count;
         return false;
       });
@@ -115,7 +115,7 @@ TEST_F(Associators, endWhereTheSinkHasEnough) {
 
 TEST_F(Associators, throwWhatTheSinkThrows) {
   const auto sink = [](const cimom::ObjectPath&) -> bool { throw std::logic_error("no room"); };
-  EXPECT_THROW(manager_.associatorNames(server_, {}, sink), std::logic_error);
+  EXPECT_THROW(manager_.associatorNames(serverPath, {}, sink), std::logic_error);
   EXPECT_THAT(calls(), ElementsAre("associatorNames of=TEST_Installed"));
 }
 
@@ -125,10 +125,10 @@ TEST_F(Associators, refuseWhatMakesNoRequest) {
   expectStatus(invalid, "key Name of class TEST_System is missing", "TEST_System");
   expectStatus(invalid, "no key Other", R"(TEST_System.Name="s",Other="x")");
   expectStatus(invalid, "TEST_None", R"(TEST_None.Name="s")");
-  expectStatus(invalid, "TEST_None", server_, {.associationClass = "TEST_None"});
-  expectStatus(invalid, "TEST_Port is no association", server_, {.associationClass = "TEST_Port"});
+  expectStatus(invalid, "TEST_None", serverPath, {.associationClass = "TEST_None"});
+  expectStatus(invalid, "TEST_Port is no association", serverPath, {.associationClass = "TEST_Port"});
   expectStatus(CMPI_RC_ERR_INVALID_NAMESPACE, "root/none", R"(root/none:TEST_System.Name="s")");
-  const Answer answer = associators(server_, {.resultClass = "TEST_None"});
+  const Answer answer = associators(serverPath, {.resultClass = "TEST_None"});
   EXPECT_EQ(answer.outcome.status.code, invalid);
   EXPECT_THAT(answer.outcome.status.description, HasSubstr("TEST_None"));
   EXPECT_THAT(calls(), IsEmpty());

@@ -142,11 +142,11 @@ class Linked : public testing::Test {
   Lines log_;
   cimom::ObjectManager manager_{linkedConfiguration(log_)};
 
-  static constexpr std::string_view server_ = R"(TEST_System.Name="s")";
-  static constexpr std::string_view controller_ = R"(TEST_Controller.Name="c")";
-  static constexpr std::string_view firmware_ = R"(TEST_Firmware.Name="f1")";
-  static constexpr std::string_view port_ = R"(TEST_Port.Name="p")";
-  static constexpr std::string_view driver_ = R"(TEST_Software.Name="d \"quoted\" \\ and, more=")";
+  static constexpr std::string_view serverPath = R"(TEST_System.Name="s")";
+  static constexpr std::string_view controllerPath = R"(TEST_Controller.Name="c")";
+  static constexpr std::string_view firmwarePath = R"(TEST_Firmware.Name="f1")";
+  static constexpr std::string_view portPath = R"(TEST_Port.Name="p")";
+  static constexpr std::string_view driverPath = R"(TEST_Software.Name="d \"quoted\" \\ and, more=")";
 
  private:
   [[nodiscard]] std::vector<std::string> logged(bool isCall) const {

@@ -6,7 +6,6 @@ namespace {
 
 using association_test::Answer;
 using association_test::Linked;
-using association_test::shown;
 using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
@@ -26,46 +25,46 @@ class References : public Linked {
 };
 
 TEST_F(References, areTheAssociationsOfTheSource) {
-  EXPECT_THAT(links(firmware_, {.associationClass = "TEST_Runs"}),
+  EXPECT_THAT(links(firmwarePath, {.associationClass = "TEST_Runs"}),
               ElementsAre("TEST_Runs(TEST_Controller c,TEST_Firmware f1)"));
-  EXPECT_THAT(links(firmware_, {.associationClass = "TEST_Installed"}),
+  EXPECT_THAT(links(firmwarePath, {.associationClass = "TEST_Installed"}),
               ElementsAre("TEST_Installed(TEST_System s,TEST_Firmware f1)",
                           "TEST_Installed(TEST_Controller c,TEST_Firmware f1)"));
-  EXPECT_THAT(links(port_, {.associationClass = "TEST_Runs"}), IsEmpty());
+  EXPECT_THAT(links(portPath, {.associationClass = "TEST_Runs"}), IsEmpty());
   EXPECT_THAT(complaints(), IsEmpty());
 }
 
 TEST_F(References, areThoseThatHoldTheSourceInTheRole) {
-  EXPECT_THAT(links(firmware_, {.associationClass = "TEST_Peer", .role = "antecedent"}),
+  EXPECT_THAT(links(firmwarePath, {.associationClass = "TEST_Peer", .role = "antecedent"}),
               ElementsAre("TEST_Peer(TEST_Firmware f1,TEST_Firmware f2)"));
-  EXPECT_THAT(links(firmware_, {.associationClass = "TEST_Peer", .role = "Dependent"}),
+  EXPECT_THAT(links(firmwarePath, {.associationClass = "TEST_Peer", .role = "Dependent"}),
               ElementsAre("TEST_Peer(TEST_Firmware f3,TEST_Firmware f1)"));
-  EXPECT_THAT(links(controller_, {.associationClass = "TEST_Runs", .role = "Antecedent"}),
+  EXPECT_THAT(links(controllerPath, {.associationClass = "TEST_Runs", .role = "Antecedent"}),
               ElementsAre("TEST_Runs(TEST_Controller c,TEST_Firmware f1)"));
   EXPECT_THAT(calls(), testing::Contains("references of=TEST_Peer role=antecedent"));
 }
 
 TEST_F(References, ofClassesWithoutTheRoleAreNotAskedFor) {
-  EXPECT_THAT(links(firmware_, {.associationClass = "TEST_Peer", .role = "System"}), IsEmpty());
+  EXPECT_THAT(links(firmwarePath, {.associationClass = "TEST_Peer", .role = "System"}), IsEmpty());
   EXPECT_THAT(calls(), IsEmpty());
 }
 
 // The provider of TEST_Holds also returns what that of TEST_HoldsMore is asked for.
 TEST_F(References, comeOnceFromAClassAndThoseBelowIt) {
   EXPECT_THAT(
-      links(server_, {.associationClass = "TEST_Holds"}),
+      links(serverPath, {.associationClass = "TEST_Holds"}),
       ElementsAre("TEST_Holds(TEST_System s,TEST_Firmware f2)", "TEST_Holds(TEST_System s,TEST_Firmware f2)",
                   "TEST_HoldsKind(TEST_System s,TEST_Port kind)",
                   "TEST_HoldsMore(TEST_System s,TEST_Port more)"));
 }
 
 TEST_F(References, takeNoNoticeOfTheFarEnd) {
-  EXPECT_EQ(links(firmware_, {"TEST_Runs", "TEST_Port", "", "Dependent"}).size(), 1U);
+  EXPECT_EQ(links(firmwarePath, {"TEST_Runs", "TEST_Port", "", "Dependent"}).size(), 1U);
 }
 
 TEST_F(References, haveThePropertiesAskedFor) {
   std::size_t count = 0;
-  manager_.references(firmware_, {.associationClass = "TEST_Runs"}, {{"Antecedent"}},
+  manager_.references(firmwarePath, {.associationClass = "TEST_Runs"}, {{"Antecedent"}},
                       [&count](const cimom::Instance& instance) {
                         count += instance.properties().size();
                         EXPECT_EQ(instance.find("Note"), nullptr);
@@ -75,8 +74,8 @@ TEST_F(References, haveThePropertiesAskedFor) {
 }
 
 TEST_F(References, handOnTheStatusOfTheProvider) {
-  for (const Answer& answer : {references(firmware_, {.associationClass = "TEST_ElementSoftware"}),
-                               referenceNames(firmware_, {.associationClass = "TEST_ElementSoftware"})}) {
+  for (const Answer& answer : {references(firmwarePath, {.associationClass = "TEST_ElementSoftware"}),
+                               referenceNames(firmwarePath, {.associationClass = "TEST_ElementSoftware"})}) {
     EXPECT_EQ(answer.outcome.status.code, CMPI_RC_ERR_NOT_SUPPORTED);
     EXPECT_EQ(answer.outcome.status.description, "no references here");
     EXPECT_THAT(answer.objects, ElementsAre("TEST_Runs(TEST_Controller c,TEST_Firmware f1)"));
@@ -155,9 +154,9 @@ TEST_F(References, mayReferToAssociations) {
 // A path does not hold the author, who is no key: the provider, which was given the role, is trusted.
 TEST_F(References, thatTheAnswerLacksAreLeftToTheProvider) {
   const Query query{.associationClass = "TEST_Remark", .role = "Author"};
-  EXPECT_EQ(references(server_, query).objects.size(), 1U);
-  EXPECT_EQ(references(controller_, query).objects.size(), 0U);
-  EXPECT_EQ(referenceNames(server_, query).objects.size(), 1U);
+  EXPECT_EQ(references(serverPath, query).objects.size(), 1U);
+  EXPECT_EQ(references(controllerPath, query).objects.size(), 0U);
+  EXPECT_EQ(referenceNames(serverPath, query).objects.size(), 1U);
   EXPECT_THAT(calls(), testing::Contains("referenceNames of=TEST_Remark role=Author"));
 }
 

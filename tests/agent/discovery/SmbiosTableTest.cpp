@@ -11,7 +11,6 @@ namespace {
 
 using namespace smbios;
 using testing::ElementsAre;
-using testing::HasSubstr;
 
 constexpr const char* threeStructures = R"(
   1 @0x0100: 1b 2b | Corvane | Rack 7
