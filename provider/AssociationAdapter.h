@@ -20,9 +20,8 @@
 
 namespace Oru::SoftwareInventoryProfileProvider {
 
-/// KELVO_SoftwareIdentity, an end of each association.
+/// Class id of KELVO_SoftwareIdentity, an end of each association.
 inline constexpr std::uint16_t softwareIdentityClassId = 2;
-inline constexpr const char* softwareIdentityClassName = "KELVO_SoftwareIdentity";
 
 /// One end of an association.
 enum class End { Element, Software };

@@ -12,7 +12,6 @@ namespace {
 
 const std::string loggerCMPISoftwareIdentity(traceCategory);
 
-constexpr const char* className = "KELVO_SoftwareIdentity";
 constexpr const char* instanceIdKey = "InstanceID";
 
 /// The getter of a text that is published as a CIM datetime.
@@ -168,7 +167,7 @@ void CMPISoftwareIdentity::setObjectPath(const CMPIObjectPath* objectPath) {
 
 CMPIObjectPath* CMPISoftwareIdentity::getObjectPath() {
   const TraceScope scope(loggerCMPISoftwareIdentity);
-  CMPIObjectPath* path = ProviderUtilities::createObjectPath(broker, className, nameSpace);
+  CMPIObjectPath* path = ProviderUtilities::createObjectPath(broker, softwareIdentityClassName, nameSpace);
   if (path == nullptr) {
     return nullptr;
   }

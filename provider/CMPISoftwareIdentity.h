@@ -10,6 +10,8 @@
 
 namespace Oru::SoftwareInventoryProfileProvider {
 
+inline constexpr const char* softwareIdentityClassName = "KELVO_SoftwareIdentity";
+
 /// Where getters put what they find, shared by all properties and kept from one instance to the next, so that
 /// its room is made once for a request.
 struct PropertyValues {

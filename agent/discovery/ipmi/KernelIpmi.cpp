@@ -1,16 +1,15 @@
 // The IPMI device of the running kernel.
+#include <agent/discovery/AwaitReadable.h>
 #include <agent/discovery/ipmi/IpmiChannel.h>
 
 #include <fcntl.h>
 #include <linux/ipmi.h>
-#include <poll.h>
 #include <sys/ioctl.h>
 #include <unistd.h>
 
 #include <algorithm>
 #include <array>
 #include <cerrno>
-#include <climits>
 
 namespace agent::discovery {
 
@@ -36,18 +35,7 @@ class KernelIpmi : public IpmiChannel {
     return ::ioctl(descriptor_, IPMICTL_SEND_COMMAND, &asked) == 0 ? 0 : errno;
   }
 
-  int awaitMessage(std::chrono::milliseconds limit) override {
-    pollfd waiting{descriptor_, POLLIN, 0};
-    const auto bounded = std::clamp<std::chrono::milliseconds::rep>(limit.count(), 0, INT_MAX);
-    const int ready = ::poll(&waiting, 1, static_cast<int>(bounded));
-    if (ready < 0) {
-      return errno;
-    }
-    if (ready == 0) {
-      return ETIMEDOUT;
-    }
-    return (waiting.revents & POLLIN) != 0 ? 0 : EIO;
-  }
+  int awaitMessage(std::chrono::milliseconds limit) override { return awaitReadable(descriptor_, limit); }
 
   Received receive() override {
     ipmi_addr address{};

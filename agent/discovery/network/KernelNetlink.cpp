@@ -1,14 +1,12 @@
 // Generic netlink of the running kernel.
+#include <agent/discovery/AwaitReadable.h>
 #include <agent/discovery/network/NetlinkChannel.h>
 
 #include <linux/netlink.h>
-#include <poll.h>
 #include <sys/socket.h>
 #include <unistd.h>
 
-#include <algorithm>
 #include <cerrno>
-#include <climits>
 
 namespace agent::discovery {
 
@@ -25,18 +23,7 @@ class KernelNetlink : public NetlinkChannel {
     return ::send(socket_, request.data(), request.size(), 0) < 0 ? errno : 0;
   }
 
-  int await(std::chrono::milliseconds limit) override {
-    pollfd waiting{socket_, POLLIN, 0};
-    const auto bounded = std::clamp<std::chrono::milliseconds::rep>(limit.count(), 0, INT_MAX);
-    const int ready = ::poll(&waiting, 1, static_cast<int>(bounded));
-    if (ready < 0) {
-      return errno;
-    }
-    if (ready == 0) {
-      return ETIMEDOUT;
-    }
-    return (waiting.revents & POLLIN) != 0 ? 0 : EIO;
-  }
+  int await(std::chrono::milliseconds limit) override { return awaitReadable(socket_, limit); }
 
   Received receive() override {
     Received received;
