@@ -105,6 +105,26 @@ class MachineEvents : public Events {
   Machine& machine_;
 };
 
+/// A source that hangs until it is released, and then gives `found`.
+class HangingLook {
+ public:
+  explicit HangingLook(const char* found) : found_(found) {}
+
+  NodeTree operator()() {
+    begun_.set_value();
+    gate_.wait();
+    return treeOf(found_);
+  }
+  void awaitBegin() { begun_.get_future().wait(); }
+  void release() { release_.set_value(); }
+
+ private:
+  const char* found_;
+  std::promise<void> begun_;
+  std::promise<void> release_;
+  std::shared_future<void> gate_ = release_.get_future().share();
+};
+
 class TreeStoreEvents : public ::testing::Test {
  protected:
   void SetUp() override {
@@ -160,19 +180,14 @@ TEST_F(TreeStoreEvents, ChangeShowsWithoutTimePassing) {
 
 TEST_F(TreeStoreEvents, NoRequestWaitsForTheLook) {
   EXPECT_EQ(description(), "before");
-  std::promise<void> begun;
-  std::promise<void> release;
-  setSource([&begun, gate = release.get_future().share()] {
-    begun.set_value();
-    gate.wait();
-    return treeOf("after");
-  });
+  HangingLook look("after");
+  setSource(std::ref(look));
   machine.change();
-  begun.get_future().wait();
+  look.awaitBegin();
   EXPECT_EQ(description(), "before") << "while the look hangs";
   seconds += 600;
   EXPECT_EQ(description(), "before") << "also when the tree is old";
-  release.set_value();
+  look.release();
   machine.awaitWait(2);
   EXPECT_EQ(description(), "after");
   EXPECT_EQ(reads, 2);
@@ -180,19 +195,14 @@ TEST_F(TreeStoreEvents, NoRequestWaitsForTheLook) {
 
 TEST_F(TreeStoreEvents, OneLookAtATime) {
   EXPECT_EQ(description(), "before");
-  std::promise<void> begun;
-  std::promise<void> release;
-  setSource([&begun, gate = release.get_future().share()] {
-    begun.set_value();
-    gate.wait();
-    return treeOf("half");
-  });
+  HangingLook look("half");
+  setSource(std::ref(look));
   seconds += 60;
   EXPECT_EQ(description(), "before");
-  begun.get_future().wait();  // the reading that the request started
+  look.awaitBegin();  // the reading that the request started
   machine.change();
   setSource([] { return treeOf("after"); });
-  release.set_value();
+  look.release();
   machine.awaitWait(2);
   EXPECT_EQ(description(), "after") << "the reading under way may have passed what changed";
   EXPECT_EQ(reads, 3);
@@ -296,18 +306,13 @@ TEST_F(TreeStoreEvents, RequestsGoOnWhereThereIsNoDescriptorForThem) {
 
 TEST_F(TreeStoreEvents, StoreEndsAfterTheLookUnderWay) {
   EXPECT_EQ(description(), "before");
-  std::promise<void> begun;
-  std::promise<void> release;
-  setSource([&begun, gate = release.get_future().share()] {
-    begun.set_value();
-    gate.wait();
-    return treeOf("after");
-  });
+  HangingLook look("after");
+  setSource(std::ref(look));
   machine.change();
-  begun.get_future().wait();
+  look.awaitBegin();
   std::future<void> ended = std::async(std::launch::async, [this] { store.reset(); });
   EXPECT_EQ(ended.wait_for(0s), std::future_status::timeout);
-  release.set_value();
+  look.release();
   ended.get();
   machine.awaitEnd();
 }
