@@ -1,0 +1,59 @@
+// HTTP as the WBEM endpoint needs it: requests come whole, answers go out while they are made.
+//
+// Nothing here knows CIM.
+#pragma once
+
+#include <functional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace cimom::http {
+
+struct Field {
+  std::string name;
+  std::string value;
+};
+
+struct Request {
+  std::string method;  ///< as sent: "POST", "M-POST", "GET"
+  std::string target;  ///< as sent, with the query: "/cimom"
+  bool isHttp10 = false;
+  std::vector<Field> fields;   ///< headers, in the order they came in
+  std::string body;            ///< whole, within the server's bound
+  std::string user;            ///< who logged in, by password or certificate; empty: nobody had to
+  std::string peer;            ///< address and port, for logs
+  bool takesTrailers = false;  ///< the client sent "TE: trailers", and the answer may be chunked
+
+  /// The first header of this name, whatever its case; nullptr where there is none.
+  [[nodiscard]] const std::string* field(std::string_view name) const;
+};
+
+/// The answer to one request, written on the thread that handles it. An answer on which nothing was called
+/// when the handler returns, or whose handler threw before `begin`, is a 500.
+class Answer {
+ public:
+  virtual ~Answer() = default;
+
+  /// The status line and headers, once, before everything else. Nothing goes out yet: the headers leave with
+  /// the first bytes of the body, or when the handler has returned.
+  virtual void begin(int status, std::vector<Field> fields) = 0;
+
+  /// More of the body; pieces of some kilobytes are best. Blocks while the client is slower than the handler
+  /// and the queue between them is full. False: the client is gone or was too slow, and nothing more will
+  /// reach it.
+  virtual bool write(std::string_view bytes) = 0;
+
+  /// Ends an answer that cannot be completed. If nothing left yet, `begin` may be called anew (false is
+  /// returned by `started`). Otherwise the trailers go out where the client takes them, else the connection
+  /// is closed without its last chunk, so that the client sees that the answer is not whole.
+  virtual void fail(std::vector<Field> trailers) = 0;
+
+  /// Whether bytes may have left for the client: from then on the status line cannot change.
+  [[nodiscard]] virtual bool started() const = 0;
+};
+
+/// Called on a worker thread, for several requests at once.
+using Handler = std::function<void(const Request&, Answer&)>;
+
+}  // namespace cimom::http
