@@ -112,6 +112,54 @@ struct ObjectManager::State {
     return request(*path);
   }
 
+  /// The path with the namespace that is meant.
+  template <class Request>
+  [[nodiscard]] Outcome onPath(const ObjectPath& path, const Request& request) const {
+    if (!path.nameSpace().empty())
+      return request(path);
+    Arena arena;
+    ObjectPath* const placed = path.copyTo(arena);
+    placed->setNameSpace(routes.defaultNameSpace(path.className()));
+    return request(*placed);
+  }
+
+  /// What `ObjectManager` does, for a source that is a path or its text.
+  template <class Source>
+  [[nodiscard]] Outcome get(const Source& source, const PropertyList& properties,
+                            const InstanceSink& sink) const {
+    InstanceReceiver client(sink);
+    CmpiProperties list(properties);
+    return onPath(source, [&](const ObjectPath& path) {
+      return dispatcher.get({path, list.get(), nullptr}, client);
+    });
+  }
+
+  using AssociationRequest = Outcome (Associations::*)(Kind kind, const Asked& asked,
+                                                       const AssociationFilter& filter,
+                                                       ResultSink& sink) const;
+
+  template <class Source>
+  [[nodiscard]] Outcome objects(AssociationRequest request, const Source& source,
+                                const AssociationQuery& query, const PropertyList& properties,
+                                const InstanceSink& sink) const {
+    InstanceReceiver client(sink);
+    CmpiProperties list(properties);
+    return onPath(source, [&](const ObjectPath& path) {
+      return (dispatcher.associations().*request)(Kind::Instances, {path, list.get(), nullptr},
+                                                  filterOf(query), client);
+    });
+  }
+
+  template <class Source>
+  [[nodiscard]] Outcome names(AssociationRequest request, const Source& source, const AssociationQuery& query,
+                              const PathSink& sink) const {
+    PathReceiver client(sink);
+    return onPath(source, [&](const ObjectPath& path) {
+      return (dispatcher.associations().*request)(Kind::Names, {path, nullptr, nullptr}, filterOf(query),
+                                                  client);
+    });
+  }
+
   ClassRepository repository;
   Dispatcher dispatcher;
   Broker broker;
@@ -150,49 +198,82 @@ Outcome ObjectManager::enumerateInstanceNames(std::string_view nameSpace, std::s
 
 Outcome ObjectManager::getInstance(std::string_view path, const PropertyList& properties,
                                    const InstanceSink& sink) {
-  InstanceReceiver client(sink);
-  CmpiProperties list(properties);
-  return state_->onPath(path, [&](const ObjectPath& asked) {
-    return state_->dispatcher.get({asked, list.get(), nullptr}, client);
-  });
+  return state_->get(path, properties, sink);
 }
 
 Outcome ObjectManager::associators(std::string_view path, const AssociationQuery& query,
                                    const PropertyList& properties, const InstanceSink& sink) {
-  InstanceReceiver client(sink);
-  CmpiProperties list(properties);
-  return state_->onPath(path, [&](const ObjectPath& source) {
-    return state_->dispatcher.associations().associators(Kind::Instances, {source, list.get(), nullptr},
-                                                         filterOf(query), client);
-  });
+  return state_->objects(&Associations::associators, path, query, properties, sink);
 }
 
 Outcome ObjectManager::associatorNames(std::string_view path, const AssociationQuery& query,
                                        const PathSink& sink) {
-  PathReceiver client(sink);
-  return state_->onPath(path, [&](const ObjectPath& source) {
-    return state_->dispatcher.associations().associators(Kind::Names, {source, nullptr, nullptr},
-                                                         filterOf(query), client);
-  });
+  return state_->names(&Associations::associators, path, query, sink);
 }
 
 Outcome ObjectManager::references(std::string_view path, const AssociationQuery& query,
                                   const PropertyList& properties, const InstanceSink& sink) {
-  InstanceReceiver client(sink);
-  CmpiProperties list(properties);
-  return state_->onPath(path, [&](const ObjectPath& source) {
-    return state_->dispatcher.associations().references(Kind::Instances, {source, list.get(), nullptr},
-                                                        filterOf(query), client);
-  });
+  return state_->objects(&Associations::references, path, query, properties, sink);
 }
 
 Outcome ObjectManager::referenceNames(std::string_view path, const AssociationQuery& query,
                                       const PathSink& sink) {
-  PathReceiver client(sink);
-  return state_->onPath(path, [&](const ObjectPath& source) {
-    return state_->dispatcher.associations().references(Kind::Names, {source, nullptr, nullptr},
-                                                        filterOf(query), client);
-  });
+  return state_->names(&Associations::references, path, query, sink);
+}
+
+Outcome ObjectManager::getInstance(const ObjectPath& path, const PropertyList& properties,
+                                   const InstanceSink& sink) {
+  return state_->get(path, properties, sink);
+}
+
+Outcome ObjectManager::associators(const ObjectPath& path, const AssociationQuery& query,
+                                   const PropertyList& properties, const InstanceSink& sink) {
+  return state_->objects(&Associations::associators, path, query, properties, sink);
+}
+
+Outcome ObjectManager::associatorNames(const ObjectPath& path, const AssociationQuery& query,
+                                       const PathSink& sink) {
+  return state_->names(&Associations::associators, path, query, sink);
+}
+
+Outcome ObjectManager::references(const ObjectPath& path, const AssociationQuery& query,
+                                  const PropertyList& properties, const InstanceSink& sink) {
+  return state_->objects(&Associations::references, path, query, properties, sink);
+}
+
+Outcome ObjectManager::referenceNames(const ObjectPath& path, const AssociationQuery& query,
+                                      const PathSink& sink) {
+  return state_->names(&Associations::references, path, query, sink);
+}
+
+Outcome ObjectManager::createInstance(std::string_view /*nameSpace*/, const Instance& /*instance*/,
+                                      const PathSink& /*sink*/) {
+  return {{CMPI_RC_ERR_NOT_SUPPORTED, {}}, false, 0};
+}
+
+Outcome ObjectManager::modifyInstance(const Instance& /*instance*/, const PropertyList& /*properties*/) {
+  return {{CMPI_RC_ERR_NOT_SUPPORTED, {}}, false, 0};
+}
+
+Outcome ObjectManager::deleteInstance(const ObjectPath& /*path*/) {
+  return {{CMPI_RC_ERR_NOT_SUPPORTED, {}}, false, 0};
+}
+
+Outcome ObjectManager::execQuery(std::string_view /*nameSpace*/, std::string_view /*language*/,
+                                 std::string_view /*query*/, const InstanceSink& /*sink*/) {
+  return {{CMPI_RC_ERR_NOT_SUPPORTED, {}}, false, 0};
+}
+
+std::vector<std::string> ObjectManager::nameSpaces() const {
+  return {};
+}
+
+bool ObjectManager::knowsNameSpace(std::string_view nameSpace) const {
+  return state_->routes.knowsNameSpace(nameSpace);
+}
+
+std::uint64_t ObjectManager::unfinishedAnswers() const {
+  return 0;
 }
 
 }  // namespace cimom

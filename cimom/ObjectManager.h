@@ -11,6 +11,7 @@
 #include <cimom/mof/ClassRepository.h>
 #include <cmpi/cmpidt.h>
 
+#include <cstdint>
 #include <filesystem>
 #include <functional>
 #include <memory>
@@ -78,6 +79,12 @@ class ObjectManager {
   /// one with other keys. `path` is a WBEM URI text (`formatWbemUri`), with or without the namespace.
   Outcome getInstance(std::string_view path, const PropertyList& properties, const InstanceSink& sink);
 
+  // Each request that names an object by a text also takes the path itself. The caller makes it, with
+  // `classTable()`, in an arena of its own that outlives the request; a path without a namespace is in the
+  // one that its class is registered in.
+
+  Outcome getInstance(const ObjectPath& path, const PropertyList& properties, const InstanceSink& sink);
+
   /// The objects at the far ends of the source's associations, or their paths. `path` names the source as in
   /// `getInstance`; its class need not have a provider.
   ///
@@ -99,14 +106,55 @@ class ObjectManager {
   /// class that it lacks; CMPI_RC_ERR_NOT_SUPPORTED from a provider without the operation; else as above.
   Outcome associators(std::string_view path, const AssociationQuery& query, const PropertyList& properties,
                       const InstanceSink& sink);
+  Outcome associators(const ObjectPath& path, const AssociationQuery& query, const PropertyList& properties,
+                      const InstanceSink& sink);
   Outcome associatorNames(std::string_view path, const AssociationQuery& query, const PathSink& sink);
+  Outcome associatorNames(const ObjectPath& path, const AssociationQuery& query, const PathSink& sink);
 
   /// The associations that refer to the source, or their paths: as above, with `associationClass` as the
   /// class of the answer. With a role, the reference of that name must hold the source. Result class and
   /// result role mean nothing here.
   Outcome references(std::string_view path, const AssociationQuery& query, const PropertyList& properties,
                      const InstanceSink& sink);
+  Outcome references(const ObjectPath& path, const AssociationQuery& query, const PropertyList& properties,
+                     const InstanceSink& sink);
   Outcome referenceNames(std::string_view path, const AssociationQuery& query, const PathSink& sink);
+  Outcome referenceNames(const ObjectPath& path, const AssociationQuery& query, const PathSink& sink);
+
+  /// Asks the provider of the instance's class to make it. The sink is given the path that the provider
+  /// answers with; the instance's own path needs no keys. The provider's answer is passed on as it is.
+  ///
+  /// CMPI_RC_ERR_INVALID_NAMESPACE and CMPI_RC_ERR_INVALID_CLASS as above, CMPI_RC_ERR_INVALID_PARAMETER
+  /// where a key that is set has another type than the class declares, CMPI_RC_ERR_NOT_SUPPORTED for a class
+  /// without a provider, for declared instances and where the provider lacks the operation.
+  Outcome createInstance(std::string_view nameSpace, const Instance& instance, const PathSink& sink);
+
+  /// Asks the provider to change the instance that `instance.path()`, with namespace and all keys, names to
+  /// the values that it has set; of a property list only those that it names. Errors as for
+  /// `createInstance`; also CMPI_RC_ERR_INVALID_PARAMETER for keys that do not fit the class. Nothing is
+  /// delivered.
+  Outcome modifyInstance(const Instance& instance, const PropertyList& properties);
+
+  /// Asks the provider to remove the instance. As `modifyInstance`.
+  Outcome deleteInstance(const ObjectPath& path);
+
+  /// Asks the provider of the class that stands after FROM. What it delivers is passed on as it is, because a
+  /// query may select anything.
+  ///
+  /// CMPI_RC_ERR_QUERY_LANGUAGE_NOT_SUPPORTED for a language other than WQL and the DMTF's CQL,
+  /// CMPI_RC_ERR_INVALID_QUERY where no class is found in the query or the schema lacks it; else as for
+  /// `createInstance`.
+  Outcome execQuery(std::string_view nameSpace, std::string_view language, std::string_view query,
+                    const InstanceSink& sink);
+
+  /// The namespaces that requests may be made in, each as it was first written.
+  [[nodiscard]] std::vector<std::string> nameSpaces() const;
+  /// Whether it is one of them. Case and leading slashes do not count.
+  [[nodiscard]] bool knowsNameSpace(std::string_view nameSpace) const;
+
+  /// How many requests, since the start, a provider ended with CMPI_RC_OK but without the done marker: what
+  /// it had delivered until then was the answer.
+  [[nodiscard]] std::uint64_t unfinishedAnswers() const;
 
  private:
   struct State;
