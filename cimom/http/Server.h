@@ -3,7 +3,12 @@
 // Nothing here knows CIM.
 #pragma once
 
+#include <cimom/http/Settings.h>
+
+#include <chrono>
+#include <cstdint>
 #include <functional>
+#include <memory>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -55,5 +60,41 @@ class Answer {
 
 /// Called on a worker thread, for several requests at once.
 using Handler = std::function<void(const Request&, Answer&)>;
+
+/// Listens from its construction to `stop` or its destruction. Its functions may be called from any thread.
+class Server {
+ public:
+  /// Throws std::runtime_error, with a message for the administrator, where the settings are not safe (a
+  /// listener that others than this machine reach needs TLS and a login), a file cannot be used or an
+  /// address cannot be listened at.
+  Server(Settings settings, Handler handler);
+
+  /// Cuts what is still under way and waits for its handlers. Call `stop` before to let requests finish.
+  ~Server();
+  Server(const Server&) = delete;
+  Server& operator=(const Server&) = delete;
+
+  /// Where it listens, in the order of the settings: "127.0.0.1:5988", "[::1]:5989", with the real port.
+  [[nodiscard]] std::vector<std::string> addresses() const;
+
+  /// The port of the listener at this position.
+  [[nodiscard]] std::uint16_t port(std::size_t listener = 0) const;
+
+  /// Reads certificates, authorities and passwords again. New connections get the new ones; on those that are
+  /// there what is under way goes on, and the next answer ends the connection. What cannot be used is
+  /// reported, in the log too, and the old stays. Empty: everything was read.
+  std::vector<std::string> reload();
+
+  /// Takes no new connections, waits until what is under way is finished, for `patience` at most, then closes
+  /// everything. False: requests were cut, and handlers may still run; the destructor waits for them.
+  bool stop(std::chrono::milliseconds patience);
+
+  /// Requests that were read or answered at this moment.
+  [[nodiscard]] std::size_t requestsUnderWay() const;
+
+ private:
+  class Core;
+  std::unique_ptr<Core> core_;
+};
 
 }  // namespace cimom::http
