@@ -38,10 +38,7 @@ Instance* Instance::from(const CMPIInstance* handle) {
 
 const NamedValue* Instance::find(std::string_view name) const {
   const PropertyInfo* const property = class_->find(name);
-  if (property == nullptr || positions_[property->index] == 0) {
-    return nullptr;
-  }
-  return &properties_[positions_[property->index] - 1];
+  return property == nullptr ? nullptr : at(property->index);
 }
 
 NamedValue& Instance::slotFor(const PropertyInfo& property) {

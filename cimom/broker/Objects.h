@@ -203,6 +203,10 @@ class Instance final : public CMPIInstance {
   [[nodiscard]] std::span<const NamedValue> properties() const { return {properties_, count_}; }
   /// Null where it was not set.
   [[nodiscard]] const NamedValue* find(std::string_view name) const;
+  /// The same by position among the properties of `classInfo()`, without a look-up.
+  [[nodiscard]] const NamedValue* at(std::uint16_t index) const {
+    return positions_[index] == 0 ? nullptr : &properties_[positions_[index] - 1];
+  }
 
   /// CMPI_RC_ERR_NO_SUCH_PROPERTY, CMPI_RC_ERR_TYPE_MISMATCH (not the declared type: nothing is widened),
   /// CMPI_RC_ERR_INVALID_DATA_TYPE (no type of a property), CMPI_RC_ERR_INVALID_HANDLE (foreign object). A

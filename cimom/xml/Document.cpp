@@ -1,0 +1,1 @@
+#include <cimom/xml/Writer.h>
