@@ -57,7 +57,7 @@ void TreeStore::waitForRereading() {
 std::shared_ptr<const NodeTree> TreeStore::current() {
   const std::lock_guard lock(mutex_);
   const bool isRead = tree_ || !failure_.empty();
-  const bool isOld = isRead && !isRereading_ && clock_() - readAt_ >= lifetime_;
+  const bool isOld = isRead && !isRereading_ && (isOutdated_ || clock_() - readAt_ >= lifetime_);
   if (tree_) {
     if (isOld) {
       startRereading();
@@ -73,12 +73,21 @@ std::shared_ptr<const NodeTree> TreeStore::current() {
   return tree_;
 }
 
+void TreeStore::lookAnew() {
+  const std::lock_guard lock(mutex_);
+  isOutdated_ = true;
+  if (tree_ && !isRereading_) {
+    startRereading();
+  }
+}
+
 void TreeStore::publish(NodeTree tree) {
   Tree fresh = std::make_shared<const NodeTree>(std::move(tree));
   const std::lock_guard lock(mutex_);
   tree_.swap(fresh);  // the earlier tree, where this is its last owner, goes after the lock
   failure_.clear();
   isFailureLogged_ = false;
+  isOutdated_ = false;
   readAt_ = clock_();
 }
 
@@ -92,6 +101,7 @@ TreeStore::Reading TreeStore::read(const TreeSource& source) {
 
 /// With the lock: who asks meanwhile has nothing to go on with.
 void TreeStore::readFirst() {
+  isOutdated_ = false;
   source_ = TreeSource::fromEnvironment();
   Reading reading = read(source_);
   tree_ = std::move(reading.tree);
@@ -109,6 +119,7 @@ void TreeStore::readFirst() {
 /// its requests.
 void TreeStore::startRereading() {
   isRereading_ = true;
+  isOutdated_ = false;
   source_ = TreeSource::fromEnvironment();
   watch();
   try {

@@ -56,6 +56,11 @@ class TreeStore {
   /// Failures are logged once until a reading succeeds.
   std::shared_ptr<const NodeTree> current();
 
+  /// Has the source read again in the background, as if its tree had come of age; a re-reading under way is
+  /// followed by another one at the next call of `current`. A failure no longer stands: the next call reads.
+  /// Without a tree yet there is nothing to do.
+  void lookAnew();
+
   /// Waits for the re-reading that is under way, if one is.
   void waitForRereading();
 
@@ -87,6 +92,7 @@ class TreeStore {
   std::string failure_;                           ///< why there is no tree
   std::chrono::steady_clock::time_point readAt_;  ///< when `tree_` or `failure_` came
   bool isRereading_ = false;
+  bool isOutdated_ = false;  ///< what was read, or is being read, no longer counts whatever its age
   bool isFailureLogged_ = false;
   bool isWatched_ = false;          ///< `watcher_` was started
   std::condition_variable reread_;  ///< the re-reading ended

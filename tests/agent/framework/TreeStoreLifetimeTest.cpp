@@ -224,5 +224,43 @@ TEST_F(TreeStoreLifetime, PublishedTreeIsNotReplacedByAnEarlierReading) {
   EXPECT_EQ(description(), "published");
 }
 
+TEST_F(TreeStoreLifetime, ALookAnewDoesNotWaitForTheTime) {
+  setSource([] { return treeOf("before"); });
+  store->lookAnew();
+  EXPECT_EQ(reads, 0) << "nobody has asked yet";
+  EXPECT_EQ(description(), "before");
+  setSource([] { return treeOf("after"); });
+  store->lookAnew();
+  store->waitForRereading();
+  EXPECT_EQ(description(), "after");
+  EXPECT_EQ(reads, 2);
+}
+
+TEST_F(TreeStoreLifetime, ALookAnewDuringAReadingIsFollowedByAnother) {
+  setSource([] { return treeOf("first"); });
+  EXPECT_EQ(description(), "first");
+  std::promise<void> release;
+  setSource([gate = release.get_future().share()] {
+    gate.wait();
+    return treeOf("begun before");
+  });
+  store->lookAnew();
+  store->lookAnew();
+  release.set_value();
+  store->waitForRereading();
+  setSource([] { return treeOf("begun after"); });
+  EXPECT_EQ(description(), "begun before");
+  store->waitForRereading();
+  EXPECT_EQ(description(), "begun after");
+}
+
+TEST_F(TreeStoreLifetime, ALookAnewEndsAFailure) {
+  setSource([]() -> NodeTree { throw std::runtime_error("half a file"); });
+  EXPECT_THAT(failure(), HasSubstr("half a file"));
+  setSource([] { return treeOf("machine"); });
+  store->lookAnew();
+  EXPECT_EQ(description(), "machine");
+}
+
 }  // namespace
 }  // namespace agent
