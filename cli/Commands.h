@@ -13,5 +13,7 @@ void runGet(const Options& options, Output& output);
 void runAssociators(const Options& options, Output& output);
 void runTree(const Options& options, Output& output);
 void runCapture(const Options& options, Output& output);
+void runServe(const Options& options, Output& output);
+void runPasswd(const Options& options, Output& output);
 
 }  // namespace cli

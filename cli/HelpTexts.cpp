@@ -1,4 +1,5 @@
 #include <cli/HelpTexts.h>
+#include <cli/ServeHelp.h>
 
 namespace cli {
 namespace {
@@ -16,6 +17,8 @@ Commands:
                    show what belongs to a computer, a port, a firmware
   tree             show the tree of devices that the inventory is made of
   capture FILE     save that tree as an inventory file
+  serve            answer WBEM clients over HTTP
+  passwd FILE USER set the password of a user of "serve"
 
 Options:
   --format table|json|csv  how to print (default: table; tree has no csv)
@@ -27,10 +30,17 @@ Options:
                            of this class, from and to these ends
   --inventory FILE         show the machine that an inventory file describes
   --system-root DIR        show the machine whose sys/, proc/, lib/ are in DIR
-  --provider FILE          load this provider library, not the installed one
+  --provider FILE          load this provider library, not the installed one; or
+                           serve the classes of a registration file (*.reg) too
+  --schema FILE            MOF with the classes of that registration; repeatable
   --log-level off|error|trace
-                           what the provider logs, on standard error (off)
+                           what the provider logs, on standard error (off;
+                           serve: error)
   --force                  capture: replace an existing file
+  --listen ADDRESS:PORT, --tls-certificate FILE, --tls-key FILE,
+  --passwords FILE, --client-ca FILE, --max-connections N, --stall-time SECONDS
+                           serve: where, to whom, and with which bounds
+  --delete                 passwd: take the user out of the file
   --version                print the version and stop
   --help, -h               print this help; after a command, that command's help
 
@@ -48,6 +58,7 @@ Examples:
   swinv associators 1@3b2                the computer and the port it belongs to
   swinv capture server.json              save this machine ...
   swinv list --inventory server.json     ... and show it elsewhere
+  swinv serve                            answer WBEM clients on this machine
 
 More: man swinv, or swinv COMMAND --help
 )";
@@ -245,6 +256,10 @@ std::string_view helpText(std::optional<Command> command) {
       return treeHelp;
     case Command::Capture:
       return captureHelp;
+    case Command::Serve:
+      return serveHelp;
+    case Command::Passwd:
+      return passwdHelp;
   }
   return programHelp;
 }
@@ -263,6 +278,10 @@ std::string_view commandName(Command command) {
       return "tree";
     case Command::Capture:
       return "capture";
+    case Command::Serve:
+      return "serve";
+    case Command::Passwd:
+      return "passwd";
   }
   return {};
 }

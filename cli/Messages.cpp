@@ -10,9 +10,10 @@
 
 namespace cli {
 
-void complain(std::string_view text) {
+void complain(std::string_view text, std::string_view mark) {
   const Charset charset = terminalAt(STDERR_FILENO).values;
-  std::string message = "swinv: ";
+  std::string message(mark);
+  message.append("swinv: ");
   while (!text.empty()) {
     const std::size_t end = std::min(text.find('\n'), text.size());
     message.append(printable(text.substr(0, end), charset)).append("\n");

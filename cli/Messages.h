@@ -12,7 +12,8 @@ class CommandError : public std::runtime_error {
   using std::runtime_error::runtime_error;
 };
 
-/// Prints "swinv: TEXT" on standard error. Control characters in it are replaced, line breaks kept.
-void complain(std::string_view text);
+/// Prints "swinv: TEXT" on standard error, behind `mark` where one is given. Control characters in it are
+/// replaced, line breaks kept. From any thread.
+void complain(std::string_view text, std::string_view mark = {});
 
 }  // namespace cli

@@ -1,26 +1,23 @@
 #include <cli/HelpTexts.h>
+#include <cli/OptionRules.h>
+#include <cli/OptionValues.h>
 #include <cli/Options.h>
 #include <cli/Text.h>
+#include <cli/UsageError.h>
 
 #include <CLI/CLI.hpp>
 #include <algorithm>
 #include <array>
 #include <memory>
-#include <stdexcept>
 #include <string_view>
 #include <utility>
 
 namespace cli {
 namespace {
 
-constexpr std::array<Command, 6> commands{Command::List,        Command::Names, Command::Get,
-                                          Command::Associators, Command::Tree,  Command::Capture};
-
-/// A command line that makes no sense; the text says why.
-class UsageError : public std::runtime_error {
- public:
-  using std::runtime_error::runtime_error;
-};
+constexpr std::array<Command, 8> commands{Command::List,        Command::Names, Command::Get,
+                                          Command::Associators, Command::Tree,  Command::Capture,
+                                          Command::Serve,       Command::Passwd};
 
 /// The arguments as they were typed, before their values are looked at.
 struct Raw {
@@ -31,6 +28,8 @@ struct Raw {
   std::string systemRoot;
   std::string provider;
   std::string logLevel;
+  std::vector<std::string> schema;
+  RawServe serve;
 };
 
 /// The options stand in the program, and fall through to it from behind a command: they may stand anywhere.
@@ -53,6 +52,10 @@ std::unique_ptr<CLI::App> makeParser(Raw& raw) {
   app->add_option("--property", raw.properties)
       ->allow_extra_args(false)
       ->multi_option_policy(CLI::MultiOptionPolicy::TakeAll);
+  app->add_option("--schema", raw.schema)
+      ->allow_extra_args(false)
+      ->multi_option_policy(CLI::MultiOptionPolicy::TakeAll);
+  addServeOptions(*app, raw.serve);
   app->fallthrough();
   app->require_subcommand(0, 1);
   for (const Command command : commands) {
@@ -63,6 +66,9 @@ std::unique_ptr<CLI::App> makeParser(Raw& raw) {
       sub->add_option("OBJECT", raw.options.object);
     } else if (command == Command::Capture) {
       sub->add_option("FILE", raw.options.captureFile);
+    } else if (command == Command::Passwd) {
+      sub->add_option("FILE", raw.serve.passwd.file);
+      sub->add_option("USER", raw.serve.passwd.user);
     }
   }
   return app;
@@ -91,47 +97,6 @@ Enum choice(const char* option, const std::string& value,
   throw UsageError(std::string(option) + " '" + value + "' is none of " + names);
 }
 
-/// An empty file name would silently mean "not set", and show another machine than was meant.
-std::optional<std::filesystem::path> fileOption(const CLI::App& app, const char* option,
-                                                const std::string& value) {
-  if (app.count(option) == 0) {
-    return std::nullopt;
-  }
-  if (value.empty()) {
-    throw UsageError(std::string(option) + " needs a name, and got an empty one");
-  }
-  return std::filesystem::path(value);
-}
-
-void checkThatOptionsApply(const CLI::App& app, Command command) {
-  struct Rule {
-    const char* option;
-    std::vector<Command> commands;
-  };
-  const std::array<Rule, 9> rules{
-      Rule{"--format", {Command::List, Command::Names, Command::Get, Command::Associators, Command::Tree}},
-      Rule{"--property", {Command::List, Command::Get, Command::Associators}},
-      Rule{"--provider", {Command::List, Command::Names, Command::Get, Command::Associators}},
-      Rule{"--force", {Command::Capture}},
-      Rule{"--assoc-class", {Command::Associators}},
-      Rule{"--result-class", {Command::Associators}},
-      Rule{"--role", {Command::Associators}},
-      Rule{"--result-role", {Command::Associators}},
-      Rule{"--names", {Command::Associators}}};
-  for (const Rule& rule : rules) {
-    const auto& known = rule.commands;
-    if (app.count(rule.option) != 0 && std::find(known.begin(), known.end(), command) == known.end()) {
-      throw UsageError("'swinv " + std::string(commandName(command)) + "' takes no " + rule.option);
-    }
-  }
-  if (app.count("--inventory") != 0 && app.count("--system-root") != 0) {
-    throw UsageError("--inventory and --system-root name two machines; give one of them");
-  }
-  if (app.count("--names") != 0 && app.count("--property") != 0) {
-    throw UsageError("--names shows no properties; leave out --names or --property");
-  }
-}
-
 /// An empty name would silently mean "any".
 void checkNames(const CLI::App& app, const Options& options) {
   for (const auto& [option, name] :
@@ -152,6 +117,9 @@ void checkArguments(const Options& options) {
   }
   if (options.command == Command::Capture && options.captureFile.empty()) {
     throw UsageError("'swinv capture' needs a file to write, or - for standard output");
+  }
+  if (options.command == Command::Passwd) {
+    checkPasswd(options.passwd);
   }
   if (options.className.empty()) {
     throw UsageError("the name of the class is empty");
@@ -180,7 +148,8 @@ std::vector<std::string> namesIn(const std::vector<std::string>& lists) {
 Options interpret(const CLI::App& app, Raw raw) {
   const std::optional<Command> command = commandOf(app);
   if (!command) {
-    throw UsageError("no command given; there are list, names, get, associators, tree and capture");
+    throw UsageError(
+        "no command given; there are list, names, get, associators, tree, capture, serve and passwd");
   }
   checkThatOptionsApply(app, *command);
   Options options = std::move(raw.options);
@@ -194,10 +163,21 @@ Options interpret(const CLI::App& app, Raw raw) {
         choice<LogLevel>("--log-level", raw.logLevel,
                          {{"off", LogLevel::Off}, {"error", LogLevel::Error}, {"trace", LogLevel::Trace}});
   }
+  if (*command == Command::Serve && !options.logLevel) {
+    options.logLevel = LogLevel::Error;  // nobody watches a server, but somebody reads its log
+  }
   options.properties = namesIn(raw.properties);
   options.inventory = fileOption(app, "--inventory", raw.inventory);
   options.systemRoot = fileOption(app, "--system-root", raw.systemRoot);
   options.provider = fileOption(app, "--provider", raw.provider);
+  for (const std::string& file : raw.schema) {
+    if (file.empty()) {
+      throw UsageError("--schema needs a name, and got an empty one");
+    }
+    options.schema.emplace_back(file);
+  }
+  options.serve = interpretServe(app, raw.serve);
+  options.passwd = raw.serve.passwd;
   checkNames(app, options);
   checkArguments(options);
   return options;

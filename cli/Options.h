@@ -1,6 +1,8 @@
 // The command line: which command, with what.
 #pragma once
 
+#include <cli/ServeOptions.h>
+
 #include <filesystem>
 #include <optional>
 #include <string>
@@ -8,7 +10,7 @@
 
 namespace cli {
 
-enum class Command { List, Names, Get, Associators, Tree, Capture };
+enum class Command { List, Names, Get, Associators, Tree, Capture, Serve, Passwd };
 enum class Format { Table, Json, Csv };
 enum class LogLevel { Off, Error, Trace };
 
@@ -28,8 +30,11 @@ struct Options {
       properties;  ///< list, get, associators: in the order given; empty: the format chooses
   std::optional<std::filesystem::path> inventory;
   std::optional<std::filesystem::path> systemRoot;
-  std::optional<std::filesystem::path> provider;
-  std::optional<LogLevel> logLevel;  ///< none: off
+  std::optional<std::filesystem::path> provider;  ///< a library, or a registration file (*.reg)
+  std::vector<std::filesystem::path> schema;      ///< MOF files besides the installed ones
+  std::optional<LogLevel> logLevel;               ///< none: off; of serve: error
+  ServeOptions serve;
+  PasswdOptions passwd;
 };
 
 /// What a command line asks for: a command, or (without options) that `standardOutput` and `standardError` be

@@ -1,70 +1,15 @@
 #include <cli/CimStatus.h>
-#include <cli/Layout.h>
+#include <cli/HostedManager.h>
 #include <cli/Messages.h>
 #include <cli/Session.h>
 #include <cli/Source.h>
 #include <cli/Text.h>
 
 #include <algorithm>
-#include <filesystem>
-#include <system_error>
-#include <utility>
 #include <vector>
 
 namespace cli {
 namespace {
-
-namespace fs = std::filesystem;
-
-/// The library, by its name in registrations, whose place --provider takes.
-constexpr std::string_view inventoryProvider = "SoftwareInventoryProvider";
-
-/// The schema's files with this extension, by name.
-std::vector<fs::path> schemaFiles(const fs::path& folder, const char* extension) {
-  std::vector<fs::path> files;
-  std::error_code error;
-  for (fs::directory_iterator entry(folder, error), end; !error && entry != end; entry.increment(error)) {
-    if (entry->path().extension() == extension) {
-      files.push_back(entry->path());
-    }
-  }
-  if (error) {
-    throw CommandError("cannot read the schema folder " + folder.string() + ": " + error.message());
-  }
-  std::sort(files.begin(), files.end());
-  return files;
-}
-
-cimom::Configuration configure(const Options& options) {
-  std::error_code error;
-  if (options.provider && !fs::exists(*options.provider, error)) {
-    throw CommandError("there is no provider library " + options.provider->string() +
-                       "; --provider takes the file that holds it");
-  }
-  const Layout layout = ownLayout();
-  cimom::Configuration configuration;
-  // In the order of their names: the CIM schema's files, which include what they stand on, before this
-  // system's.
-  configuration.schema = schemaFiles(layout.schema, ".mof");
-  configuration.providerFolder = layout.libraries;
-  for (const fs::path& file : schemaFiles(layout.schema, ".reg")) {
-    for (cimom::ProviderRegistration& registration : cimom::readRegistrations(file)) {
-      if (options.provider && registration.location == inventoryProvider) {
-        registration.location = fs::absolute(*options.provider).string();
-      }
-      configuration.providers.push_back(std::move(registration));
-    }
-  }
-  if (configuration.providers.empty()) {
-    throw CommandError("no provider is registered: no .reg file in the schema folder " +
-                       layout.schema.string() +
-                       " names a class\nThe files belong to swinv; install or build swinv again.");
-  }
-  if (options.logLevel.value_or(LogLevel::Off) != LogLevel::Off) {
-    configuration.log = [](std::string_view line) { complain(line); };
-  }
-  return configuration;
-}
 
 /// What to do about a failure that has no description: a provider's status carries none.
 std::string hintFor(const cimom::Status& status, bool logs) {
@@ -92,17 +37,9 @@ std::string ownClasses(const cimom::ClassRepository& classes) {
 }  // namespace
 
 Session::Session(const Options& options)
-    : source_(checkedSource()), logs_(options.logLevel.value_or(LogLevel::Off) != LogLevel::Off) {
-  try {
-    manager_ = std::make_unique<cimom::ObjectManager>(configure(options));
-  } catch (const CommandError&) {
-    throw;
-  } catch (const cimom::RegistrationError& error) {
-    throw CommandError(std::string("the registration of the providers cannot be used: ") + error.what());
-  } catch (const std::exception& error) {
-    throw CommandError(std::string("the CIM schema cannot be used: ") + error.what());
-  }
-}
+    : source_(checkedSource()),
+      logs_(options.logLevel.value_or(LogLevel::Off) != LogLevel::Off),
+      manager_(makeManager(options)) {}
 
 const cimom::SchemaClass& Session::classNamed(const std::string& name) const {
   const cimom::SchemaClass* info = manager_->classes().find(name);

@@ -39,6 +39,14 @@ void run(const cli::Options& options, cli::Output& output) {
       return cli::runTree(options, output);
     case cli::Command::Capture:
       return cli::runCapture(options, output);
+    case cli::Command::Serve:
+    case cli::Command::Passwd:
+#ifdef SWINV_HAS_ENDPOINT
+      return options.command == cli::Command::Serve ? cli::runServe(options, output)
+                                                    : cli::runPasswd(options, output);
+#else
+      throw cli::CommandError("this build has no endpoint");
+#endif
   }
 }
 

@@ -4,6 +4,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <array>
 #include <fstream>
 #include <sstream>
 
@@ -15,6 +16,9 @@ using cli::Format;
 using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
+
+constexpr std::array allCommands{Command::List, Command::Names,   Command::Get,   Command::Associators,
+                                 Command::Tree, Command::Capture, Command::Serve, Command::Passwd};
 
 CommandLine parse(std::vector<std::string> arguments) {
   return cli::parseCommandLine(std::move(arguments));
@@ -196,8 +200,7 @@ TEST(Help, HelpAndManualNameEveryOption) {
 
 TEST(Help, HelpAndManualNameNoOptionThatIsNone) {
   std::vector<std::string> texts{manual(), std::string(cli::helpText(std::nullopt))};
-  for (const Command command :
-       {Command::List, Command::Names, Command::Get, Command::Associators, Command::Tree, Command::Capture}) {
+  for (const Command command : allCommands) {
     texts.emplace_back(cli::helpText(command));
   }
   for (const std::string& text : texts) {
@@ -206,8 +209,7 @@ TEST(Help, HelpAndManualNameNoOptionThatIsNone) {
 }
 
 TEST(Help, TheManualNamesEveryCommand) {
-  for (const Command command :
-       {Command::List, Command::Names, Command::Get, Command::Associators, Command::Tree, Command::Capture}) {
+  for (const Command command : allCommands) {
     EXPECT_THAT(manual(), HasSubstr("swinv " + std::string(cli::commandName(command))));
     EXPECT_THAT(std::string(cli::helpText(command)), HasSubstr("Example"));
   }
@@ -223,10 +225,9 @@ TEST(Help, TheNetworkAssociationIsToldOfByWhereItIsAsked) {
 }
 
 TEST(Help, LinesFitATerminal) {
-  for (const std::optional<Command> command :
-       {std::optional<Command>(), std::optional(Command::List), std::optional(Command::Names),
-        std::optional(Command::Get), std::optional(Command::Associators), std::optional(Command::Tree),
-        std::optional(Command::Capture)}) {
+  std::vector<std::optional<Command>> commands(allCommands.begin(), allCommands.end());
+  commands.emplace_back();
+  for (const std::optional<Command> command : commands) {
     std::istringstream lines{std::string(cli::helpText(command))};
     for (std::string line; std::getline(lines, line);) {
       EXPECT_LE(line.size(), 80U) << line;
