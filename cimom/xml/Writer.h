@@ -2,7 +2,7 @@
 // whenever enough has come together.
 //
 // A response is
-//   beginResponse, then appendError, or beginReturnValue, objects, endReturnValue and appendOutParameter,
+//   beginResponse, then appendError, or beginReturnValue, objects, endReturnValue and parameters,
 //   then endResponse.
 // Text that XML cannot carry is replaced as `Text.h` says: a document is never broken by what is in it.
 #pragma once
@@ -12,7 +12,6 @@
 #include <cimom/xml/PathWriter.h>
 #include <cmpi/cmpidt.h>
 
-#include <cstdint>
 #include <string>
 #include <string_view>
 
@@ -30,13 +29,18 @@ void endResponse(std::string& out, MethodKind kind = MethodKind::intrinsic);
 void beginReturnValue(std::string& out);
 void endReturnValue(std::string& out);
 
-/// ERROR; without DESCRIPTION where it is empty.
-void appendError(std::string& out, CMPIrc code, std::string_view description);
+/// ERROR; without DESCRIPTION where it is empty. `code` is a CIM status code (CMPIrc has the first of them);
+/// what is none (0, 30 and above, such as CMPI's own) is written as 1, CIM_ERR_FAILED.
+void appendError(std::string& out, int code, std::string_view description);
 
-/// A parameter that an operation gives back beside its return value: EnumerationContext (a text; none is
-/// written as null), EndOfSequence.
+/// PARAMVALUE: what an operation gives back beside its return value.
 void appendOutParameter(std::string& out, std::string_view name, std::string_view text);
 void appendOutParameter(std::string& out, std::string_view name, bool flag);
-void appendNullOutParameter(std::string& out, std::string_view name, std::string_view cimType);
+/// A literal is a text; without this one it would be taken for a boolean.
+inline void appendOutParameter(std::string& out, std::string_view name, const char* text) {
+  appendOutParameter(out, name, std::string_view(text));
+}
+/// Null; `type` is the parameter's.
+void appendNullOutParameter(std::string& out, std::string_view name, CMPIType type);
 
 }  // namespace cimom::xml
