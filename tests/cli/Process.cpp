@@ -78,7 +78,9 @@ std::vector<std::string> environmentOf(const Start& start) {
   return texts;
 }
 
-pid_t spawn(const Start& start, int output, int error) {
+}  // namespace
+
+int spawn(const Start& start, int output, int error) {
   posix_spawn_file_actions_t actions;
   posix_spawn_file_actions_init(&actions);
   posix_spawn_file_actions_adddup2(&actions, output, STDOUT_FILENO);
@@ -99,13 +101,11 @@ pid_t spawn(const Start& start, int output, int error) {
   return process;
 }
 
-int exitCodeOf(pid_t process) {
+int exitCodeOf(int process) {
   int status = 0;
   waitpid(process, &status, 0);
   return WIFEXITED(status) ? WEXITSTATUS(status) : -WTERMSIG(status);
 }
-
-}  // namespace
 
 Result run(const Start& start) {
   const Descriptor output(memfd_create("stdout", MFD_CLOEXEC));

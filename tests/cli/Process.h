@@ -23,6 +23,13 @@ struct Start {
   bool closeStandardOutput = false;  ///< start without one
 };
 
+/// Starts, and does not wait. `output` and `error` are the descriptors of its standard output and error.
+/// Throws `std::runtime_error` where the process cannot be started.
+int spawn(const Start& start, int output, int error);
+
+/// Waits for the end: as in `Result`.
+int exitCodeOf(int process);
+
 /// Runs to the end. Throws `std::runtime_error` where the process cannot be started.
 Result run(const Start& start);
 

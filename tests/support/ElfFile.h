@@ -38,15 +38,15 @@ class ElfFile {
   }
 
   /// DT_NEEDED entries.
-  [[nodiscard]] std::vector<std::string> neededLibraries() const {
-    std::vector<std::string> names;
-    const Elf64_Shdr strings = sectionAt(section(SHT_DYNAMIC).sh_link);
-    for (const Elf64_Dyn& entry : dynamicEntries()) {
-      if (entry.d_tag == DT_NEEDED) {
-        names.push_back(text(strings, entry.d_un.d_val));
-      }
+  [[nodiscard]] std::vector<std::string> neededLibraries() const { return dynamicTexts(DT_NEEDED); }
+
+  /// Where the loader looks for them first: DT_RUNPATH, and DT_RPATH, as they stand there.
+  [[nodiscard]] std::vector<std::string> runPaths() const {
+    std::vector<std::string> paths = dynamicTexts(DT_RUNPATH);
+    for (const std::string& path : dynamicTexts(DT_RPATH)) {
+      paths.push_back(path);
     }
-    return names;
+    return paths;
   }
 
   /// DT_FLAGS_1 (DF_1_NODELETE and the like); 0 where there are none.
@@ -81,6 +81,17 @@ class ElfFile {
       }
     }
     throw std::runtime_error("no such section");
+  }
+
+  [[nodiscard]] std::vector<std::string> dynamicTexts(Elf64_Sxword tag) const {
+    std::vector<std::string> texts;
+    const Elf64_Shdr strings = sectionAt(section(SHT_DYNAMIC).sh_link);
+    for (const Elf64_Dyn& entry : dynamicEntries()) {
+      if (entry.d_tag == tag) {
+        texts.push_back(text(strings, entry.d_un.d_val));
+      }
+    }
+    return texts;
   }
 
   [[nodiscard]] std::vector<Elf64_Dyn> dynamicEntries() const {
