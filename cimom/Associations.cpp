@@ -132,7 +132,7 @@ Roles Associations::roles(const Route& route, const Asked& asked) const {
     result.learnFrom(*first.get());
     book_.keep(route, result);
   } else if (outcome.status.code != CMPI_RC_OK) {
-    dispatcher_.report(
+    dispatcher_.diagnostics().report(
         "roles in class " + std::string(route.info->name()) +
         " go by its declaration, because its names cannot be enumerated: " + outcome.status.description);
   }
@@ -151,15 +151,15 @@ Outcome Associations::associators(Kind kind, const Asked& asked, const Associati
   return askEach(query.routes, delivery, [&](const Route& route) {
     const auto known = roles.find(&route);
     delivery.startAnswer(known == roles.end() ? nullptr : &known->second);
-    ProviderCall call(asked, asked.path.className(), 0, delivery);
+    ProviderCall call(route, asked, asked.path.className(), 0, delivery);
     const char* const association = route.info->name().data();
     Status status =
         kind == Kind::Instances
-            ? call.ask(route, &ProviderLibrary::associationMI, &CMPIAssociationMIFT::associators, association,
+            ? call.ask(&ProviderLibrary::associationMI, &CMPIAssociationMIFT::associators, association,
                        query.filter.resultClass, query.filter.role, query.filter.resultRole, asked.properties)
-            : call.ask(route, &ProviderLibrary::associationMI, &CMPIAssociationMIFT::associatorNames,
-                       association, query.filter.resultClass, query.filter.role, query.filter.resultRole);
-    return call.concluded(std::move(status), route, delivery, dispatcher_.log());
+            : call.ask(&ProviderLibrary::associationMI, &CMPIAssociationMIFT::associatorNames, association,
+                       query.filter.resultClass, query.filter.role, query.filter.resultRole);
+    return call.concluded(std::move(status), delivery, dispatcher_.diagnostics());
   });
 }
 
@@ -178,14 +178,14 @@ Outcome Associations::references(Kind kind, const Asked& asked, const Associatio
   ReferenceDelivery delivery(kind, sink, asked.properties, asked.path, role);
   return askEach(query.routes, delivery, [&](const Route& route) {
     delivery.startRoute(routes, route, *route.info, asked.path.nameSpace());
-    ProviderCall call(asked, asked.path.className(), 0, delivery);
+    ProviderCall call(route, asked, asked.path.className(), 0, delivery);
     const char* const association = route.info->name().data();
     Status status = kind == Kind::Instances
-                        ? call.ask(route, &ProviderLibrary::associationMI, &CMPIAssociationMIFT::references,
+                        ? call.ask(&ProviderLibrary::associationMI, &CMPIAssociationMIFT::references,
                                    association, role, asked.properties)
-                        : call.ask(route, &ProviderLibrary::associationMI,
-                                   &CMPIAssociationMIFT::referenceNames, association, role);
-    return call.concluded(std::move(status), route, delivery, dispatcher_.log());
+                        : call.ask(&ProviderLibrary::associationMI, &CMPIAssociationMIFT::referenceNames,
+                                   association, role);
+    return call.concluded(std::move(status), delivery, dispatcher_.diagnostics());
   });
 }
 

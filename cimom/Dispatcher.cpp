@@ -6,18 +6,18 @@
 
 namespace cimom {
 
-void Dispatcher::report(const std::string& line) const {
-  if (log_)
-    log_(line);
-}
-
-Status Dispatcher::check(const ObjectPath& path) const {
+Status Dispatcher::checkNameSpace(const ObjectPath& path) const {
   if (!routes_->knowsNameSpace(path.nameSpace()))
     return {CMPI_RC_ERR_INVALID_NAMESPACE,
             "no class is registered in namespace '" + std::string(path.nameSpace()) + "'"};
-  if (path.classInfo() == nullptr)
-    return {CMPI_RC_ERR_INVALID_CLASS, "the schema has no class " + std::string(path.className())};
   return Nesting::check();
+}
+
+Status Dispatcher::check(const ObjectPath& path) const {
+  Status status = checkNameSpace(path);
+  if (status.code == CMPI_RC_OK && path.classInfo() == nullptr)
+    return {CMPI_RC_ERR_INVALID_CLASS, "the schema has no class " + std::string(path.className())};
+  return status;
 }
 
 Outcome Dispatcher::enumerate(Kind kind, const Asked& asked, ResultSink& sink) const {
@@ -32,13 +32,12 @@ Outcome Dispatcher::enumerate(Kind kind, const Asked& asked, ResultSink& sink) c
   EnumerationDelivery delivery(kind, sink, asked.properties);
   return askEach(routes, delivery, [&](const Route& route) {
     delivery.startRoute(*routes_, route, *path.classInfo(), path.nameSpace());
-    ProviderCall call(asked, route.info->name(), CMPI_FLAG_DeepInheritance, delivery);
+    ProviderCall call(route, asked, route.info->name(), CMPI_FLAG_DeepInheritance, delivery);
     Status status =
         kind == Kind::Instances
-            ? call.ask(route, &ProviderLibrary::instanceMI, &CMPIInstanceMIFT::enumerateInstances,
-                       asked.properties)
-            : call.ask(route, &ProviderLibrary::instanceMI, &CMPIInstanceMIFT::enumerateInstanceNames);
-    return call.concluded(std::move(status), route, delivery, log_);
+            ? call.ask(&ProviderLibrary::instanceMI, &CMPIInstanceMIFT::enumerateInstances, asked.properties)
+            : call.ask(&ProviderLibrary::instanceMI, &CMPIInstanceMIFT::enumerateInstanceNames);
+    return call.concluded(std::move(status), delivery, diagnostics_);
   });
 }
 
@@ -59,13 +58,14 @@ Outcome Dispatcher::get(const Asked& asked, ResultSink& sink) const {
 Outcome Dispatcher::getFrom(const Asked& asked, const Route& route, ResultSink& sink) const {
   Arena arena;
   SingleAnswer answer(arena);
-  ProviderCall call(asked, route.info->name(), 0, answer);
+  ProviderCall call(route, asked, route.info->name(), 0, answer);
   Outcome outcome;
-  outcome.status =
-      call.ask(route, &ProviderLibrary::instanceMI, &CMPIInstanceMIFT::getInstance, asked.properties);
+  outcome.status = call.ask(&ProviderLibrary::instanceMI, &CMPIInstanceMIFT::getInstance, asked.properties);
   outcome.done = call.result().done();
   if (outcome.status.code != CMPI_RC_OK)
     return outcome;
+  if (!outcome.done)
+    diagnostics_.countUnfinished();
 
   std::string wrong;
   if (answer.count() == 0)
@@ -77,12 +77,12 @@ Outcome Dispatcher::getFrom(const Asked& asked, const Route& route, ResultSink& 
   else if (!samePath(answer.first()->path(), asked.path))
     wrong = "another instance than was asked for: " + formatWbemUri(answer.first()->path());
   if (!wrong.empty()) {
-    report(named(route) + " answered for " + formatWbemUri(asked.path) + " with " + wrong);
+    diagnostics_.report(named(route) + " answered for " + formatWbemUri(asked.path) + " with " + wrong);
     outcome.status = {CMPI_RC_ERR_NOT_FOUND, named(route) + " answered with " + wrong};
     return outcome;
   }
   if (!outcome.done)
-    report(named(route) + " sent no done marker for " + formatWbemUri(asked.path));
+    diagnostics_.report(named(route) + " sent no done marker for " + formatWbemUri(asked.path));
   if (const auto names = propertyNames(asked.properties))
     answer.first()->restrictTo(*names);
   outcome.delivered = 1;
@@ -125,6 +125,25 @@ UpcallStatus Dispatcher::references(const Context& context, const ObjectPath& pa
 UpcallStatus Dispatcher::referenceNames(const Context& context, const ObjectPath& path,
                                         const AssociationFilter& filter, ResultSink& sink) {
   return associations_.references(Kind::Names, {path, nullptr, &context}, filter, sink).status;
+}
+
+UpcallStatus Dispatcher::createInstance(const Context& context, const ObjectPath& path,
+                                        const Instance& instance, ResultSink& sink) {
+  return changes_.create({path, nullptr, &context}, instance, sink).status;
+}
+
+UpcallStatus Dispatcher::modifyInstance(const Context& context, const ObjectPath& path,
+                                        const Instance& instance, const char** properties) {
+  return changes_.modify({path, properties, &context}, instance).status;
+}
+
+UpcallStatus Dispatcher::deleteInstance(const Context& context, const ObjectPath& path) {
+  return changes_.remove({path, nullptr, &context}).status;
+}
+
+UpcallStatus Dispatcher::execQuery(const Context& context, const ObjectPath& path, std::string_view query,
+                                   std::string_view language, ResultSink& sink) {
+  return changes_.query({path, nullptr, &context}, query, language, sink).status;
 }
 
 }  // namespace cimom

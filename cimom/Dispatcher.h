@@ -5,6 +5,7 @@
 #pragma once
 
 #include <cimom/Associations.h>
+#include <cimom/Changes.h>
 #include <cimom/Outcome.h>
 #include <cimom/ProviderCall.h>
 #include <cimom/Routes.h>
@@ -20,7 +21,7 @@ namespace cimom {
 
 class Dispatcher final : public UpcallTarget {
  public:
-  explicit Dispatcher(Log log) : log_(std::move(log)), associations_(*this) {}
+  explicit Dispatcher(Log log) : diagnostics_(std::move(log)), associations_(*this), changes_(*this) {}
 
   /// Called once, before the first request: the routes need the broker, which needs this.
   void setRoutes(const Routes& routes) { routes_ = &routes; }
@@ -34,14 +35,16 @@ class Dispatcher final : public UpcallTarget {
   Outcome get(const Asked& asked, ResultSink& sink) const;
 
   [[nodiscard]] const Associations& associations() const { return associations_; }
+  [[nodiscard]] const Changes& changes() const { return changes_; }
 
   /// CMPI_RC_ERR_INVALID_NAMESPACE or CMPI_RC_ERR_INVALID_CLASS for a path whose namespace or class nobody
   /// knows, CMPI_RC_ERR_FAILED where providers ask each other too deep.
   [[nodiscard]] Status check(const ObjectPath& path) const;
+  /// The same for a path whose class does not count.
+  [[nodiscard]] Status checkNameSpace(const ObjectPath& path) const;
 
   [[nodiscard]] const Routes& routes() const { return *routes_; }
-  [[nodiscard]] const Log& log() const { return log_; }
-  void report(const std::string& line) const;
+  [[nodiscard]] const Diagnostics& diagnostics() const { return diagnostics_; }
 
   UpcallStatus enumerateInstances(const Context& context, const ObjectPath& path, const char** properties,
                                   ResultSink& sink) override;
@@ -57,13 +60,21 @@ class Dispatcher final : public UpcallTarget {
                           const char** properties, ResultSink& sink) override;
   UpcallStatus referenceNames(const Context& context, const ObjectPath& path, const AssociationFilter& filter,
                               ResultSink& sink) override;
+  UpcallStatus createInstance(const Context& context, const ObjectPath& path, const Instance& instance,
+                              ResultSink& sink) override;
+  UpcallStatus modifyInstance(const Context& context, const ObjectPath& path, const Instance& instance,
+                              const char** properties) override;
+  UpcallStatus deleteInstance(const Context& context, const ObjectPath& path) override;
+  UpcallStatus execQuery(const Context& context, const ObjectPath& path, std::string_view query,
+                         std::string_view language, ResultSink& sink) override;
 
  private:
   Outcome getFrom(const Asked& asked, const Route& route, ResultSink& sink) const;
 
-  Log log_;
+  Diagnostics diagnostics_;
   const Routes* routes_ = nullptr;
   Associations associations_;
+  Changes changes_;
 };
 
 }  // namespace cimom

@@ -32,6 +32,15 @@ Status checkKeys(const ObjectPath& path, const ClassInfo& info) {
     if (path.find(key.name) == nullptr)
       return invalid("key " + std::string(key.name) + " of class " + className + " is missing");
   }
+  if (Status status = checkGivenKeys(path, info); status.code != CMPI_RC_OK)
+    return status;
+  if (info.keys().empty())
+    return invalid("class " + className + " has no keys: its instances cannot be named");
+  return {};
+}
+
+Status checkGivenKeys(const ObjectPath& path, const ClassInfo& info) {
+  const std::string className(info.name());
   for (const NamedValue& given : path.keys()) {
     const PropertyInfo* key = info.find(given.name);
     if (key == nullptr || !key->isKey)
@@ -41,8 +50,6 @@ Status checkKeys(const ObjectPath& path, const ClassInfo& info) {
     if (!agree(key->type, given.data.type))
       return invalid("key " + std::string(key->name) + " of class " + className + " has the wrong type");
   }
-  if (info.keys().empty())
-    return invalid("class " + className + " has no keys: its instances cannot be named");
   return {};
 }
 

@@ -11,4 +11,7 @@ namespace cimom {
 /// their size.
 [[nodiscard]] Status checkKeys(const ObjectPath& path, const ClassInfo& info);
 
+/// The same for a path that may lack keys.
+[[nodiscard]] Status checkGivenKeys(const ObjectPath& path, const ClassInfo& info);
+
 }  // namespace cimom

@@ -1,10 +1,12 @@
 #include <cimom/Dispatcher.h>
 #include <cimom/ObjectManager.h>
+#include <cimom/QueryText.h>
 #include <cimom/Routes.h>
 #include <cimom/broker/Arena.h>
 #include <cimom/broker/Broker.h>
 #include <cimom/broker/WbemUri.h>
 
+#include <algorithm>
 #include <utility>
 
 namespace cimom {
@@ -69,6 +71,11 @@ class CmpiProperties {
   std::vector<const char*> names_;
 };
 
+std::string_view withoutSlashes(std::string_view nameSpace) {
+  nameSpace.remove_prefix(std::min(nameSpace.find_first_not_of('/'), nameSpace.size()));
+  return nameSpace;
+}
+
 AssociationFilter filterOf(const AssociationQuery& query) {
   return {query.associationClass.c_str(), query.resultClass.c_str(), query.role.c_str(),
           query.resultRole.c_str()};
@@ -88,11 +95,13 @@ struct ObjectManager::State {
   /// The path of a class, in the namespace that is meant.
   [[nodiscard]] const ObjectPath& classPath(Arena& arena, std::string_view nameSpace,
                                             std::string_view className) const {
-    const std::size_t slashes = std::min(nameSpace.find_first_not_of('/'), nameSpace.size());
-    nameSpace.remove_prefix(slashes);
-    if (nameSpace.empty())
-      nameSpace = routes.defaultNameSpace(className);
-    return *ObjectPath::create(arena, broker.classes(), nameSpace, className);
+    return *ObjectPath::create(arena, broker.classes(), nameSpaceMeant(nameSpace, className), className);
+  }
+
+  [[nodiscard]] std::string_view nameSpaceMeant(std::string_view nameSpace,
+                                                std::string_view className) const {
+    nameSpace = withoutSlashes(nameSpace);
+    return nameSpace.empty() ? routes.defaultNameSpace(className) : nameSpace;
   }
 
   /// Runs `request(path)` on the path that the text names.
@@ -246,22 +255,34 @@ Outcome ObjectManager::referenceNames(const ObjectPath& path, const AssociationQ
   return state_->names(&Associations::references, path, query, sink);
 }
 
-Outcome ObjectManager::createInstance(std::string_view /*nameSpace*/, const Instance& /*instance*/,
-                                      const PathSink& /*sink*/) {
-  return {{CMPI_RC_ERR_NOT_SUPPORTED, {}}, false, 0};
+Outcome ObjectManager::createInstance(std::string_view nameSpace, const Instance& instance,
+                                      const PathSink& sink) {
+  Arena arena;
+  PathReceiver client(sink);
+  ObjectPath* const path = instance.path().copyTo(arena);
+  path->setNameSpace(state_->nameSpaceMeant(nameSpace, path->className()));
+  return state_->dispatcher.changes().create({*path, nullptr, nullptr}, instance, client);
 }
 
-Outcome ObjectManager::modifyInstance(const Instance& /*instance*/, const PropertyList& /*properties*/) {
-  return {{CMPI_RC_ERR_NOT_SUPPORTED, {}}, false, 0};
+Outcome ObjectManager::modifyInstance(const Instance& instance, const PropertyList& properties) {
+  CmpiProperties list(properties);
+  return state_->onPath(instance.path(), [&](const ObjectPath& path) {
+    return state_->dispatcher.changes().modify({path, list.get(), nullptr}, instance);
+  });
 }
 
-Outcome ObjectManager::deleteInstance(const ObjectPath& /*path*/) {
-  return {{CMPI_RC_ERR_NOT_SUPPORTED, {}}, false, 0};
+Outcome ObjectManager::deleteInstance(const ObjectPath& path) {
+  return state_->onPath(path, [&](const ObjectPath& asked) {
+    return state_->dispatcher.changes().remove({asked, nullptr, nullptr});
+  });
 }
 
-Outcome ObjectManager::execQuery(std::string_view /*nameSpace*/, std::string_view /*language*/,
-                                 std::string_view /*query*/, const InstanceSink& /*sink*/) {
-  return {{CMPI_RC_ERR_NOT_SUPPORTED, {}}, false, 0};
+Outcome ObjectManager::execQuery(std::string_view nameSpace, std::string_view language,
+                                 std::string_view query, const InstanceSink& sink) {
+  Arena arena;
+  InstanceReceiver client(sink);
+  const ObjectPath& path = state_->classPath(arena, nameSpace, classOfQuery(query));
+  return state_->dispatcher.changes().query({path, nullptr, nullptr}, query, language, client);
 }
 
 std::vector<std::string> ObjectManager::nameSpaces() const {
@@ -269,11 +290,11 @@ std::vector<std::string> ObjectManager::nameSpaces() const {
 }
 
 bool ObjectManager::knowsNameSpace(std::string_view nameSpace) const {
-  return state_->routes.knowsNameSpace(nameSpace);
+  return state_->routes.knowsNameSpace(withoutSlashes(nameSpace));
 }
 
 std::uint64_t ObjectManager::unfinishedAnswers() const {
-  return 0;
+  return state_->dispatcher.diagnostics().unfinished();
 }
 
 }  // namespace cimom

@@ -138,12 +138,11 @@ class ObjectManager {
   /// Asks the provider to remove the instance. As `modifyInstance`.
   Outcome deleteInstance(const ObjectPath& path);
 
-  /// Asks the provider of the class that stands after FROM. What it delivers is passed on as it is, because a
-  /// query may select anything.
+  /// Asks the provider of the class that stands after FROM, in whatever language that is: what it answers
+  /// with is passed on as it is, because a query may select anything.
   ///
-  /// CMPI_RC_ERR_QUERY_LANGUAGE_NOT_SUPPORTED for a language other than WQL and the DMTF's CQL,
-  /// CMPI_RC_ERR_INVALID_QUERY where no class is found in the query or the schema lacks it; else as for
-  /// `createInstance`.
+  /// Where no class of the schema is found there, CMPI_RC_ERR_INVALID_QUERY for the standard's languages
+  /// (WQL, CQL) and CMPI_RC_ERR_QUERY_LANGUAGE_NOT_SUPPORTED for all others; else as for `createInstance`.
   Outcome execQuery(std::string_view nameSpace, std::string_view language, std::string_view query,
                     const InstanceSink& sink);
 
@@ -152,7 +151,7 @@ class ObjectManager {
   /// Whether it is one of them. Case and leading slashes do not count.
   [[nodiscard]] bool knowsNameSpace(std::string_view nameSpace) const;
 
-  /// How many requests, since the start, a provider ended with CMPI_RC_OK but without the done marker: what
+  /// How often, since the start, a provider ended an answer with CMPI_RC_OK but without the done marker: what
   /// it had delivered until then was the answer.
   [[nodiscard]] std::uint64_t unfinishedAnswers() const;
 

@@ -11,8 +11,9 @@ Status Nesting::check() {
           "providers ask each other more than " + std::to_string(deepest) + " calls deep"};
 }
 
-ProviderCall::ProviderCall(const Asked& asked, std::string_view className, CMPIFlags flags, ResultSink& sink)
-    : scope_(&request_), result_(sink, request_) {
+ProviderCall::ProviderCall(const Route& route, const Asked& asked, std::string_view className,
+                           CMPIFlags flags, ResultSink& sink)
+    : route_(route), scope_(&request_), result_(sink, request_, route.recycling) {
   Arena& held = request_.held();
   if (asked.context == nullptr) {
     context_ = Context::create(held);
@@ -25,13 +26,10 @@ ProviderCall::ProviderCall(const Asked& asked, std::string_view className, CMPIF
   path_->setClassName(className);
 }
 
-Outcome ProviderCall::concluded(Status status, const Route& route, const Delivery& delivery,
-                                const Log& log) const {
-  const auto report = [&](const std::string& what) {
-    if (log)
-      log(named(route) + what);
-  };
-  const std::string className(route.info->name());
+Outcome ProviderCall::concluded(Status status, const Delivery& delivery,
+                                const Diagnostics& diagnostics) const {
+  const auto report = [&](const std::string& what) { diagnostics.report(named(route_) + what); };
+  const std::string className(route_.info->name());
   if (delivery.strangers() > 0)
     report(" answered for class " + className + " with " + std::to_string(delivery.strangers()) +
            " objects that nobody asked for, the first of class " + delivery.strangersClass() +
@@ -39,9 +37,11 @@ Outcome ProviderCall::concluded(Status status, const Route& route, const Deliver
   if (result_.refused() > 0)
     report(" answered for class " + className + " with " + std::to_string(result_.refused()) +
            " nulls or foreign objects, or after its done marker; they are left out");
-  if (status.code == CMPI_RC_OK && !result_.done())
+  if (status.code == CMPI_RC_OK && !result_.done()) {
+    diagnostics.countUnfinished();
     report(" stopped early: for class " + className + " it sent " + std::to_string(result_.delivered()) +
            " objects and no done marker");
+  }
   return {std::move(status), result_.done(), result_.delivered()};
 }
 

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <cimom/Delivery.h>
+#include <cimom/Diagnostics.h>
 #include <cimom/Outcome.h>
 #include <cimom/Routes.h>
 #include <cimom/broker/Context.h>
@@ -11,16 +12,12 @@
 #include <cmpi/cmpidt.h>
 
 #include <exception>
-#include <functional>
 #include <string>
 #include <string_view>
 #include <utility>
 #include <vector>
 
 namespace cimom {
-
-/// Takes one line of diagnostics; may be empty.
-using Log = std::function<void(std::string_view)>;
 
 /// What is asked, and by whom.
 struct Asked {
@@ -55,20 +52,23 @@ class Nesting {
 
 class ProviderCall {
  public:
-  /// The provider is given the path that was asked with, with `className` in it.
-  ProviderCall(const Asked& asked, std::string_view className, CMPIFlags flags, ResultSink& sink);
+  /// A call to the provider of `route`, which is given the path that was asked with, with `className` in it.
+  ProviderCall(const Route& route, const Asked& asked, std::string_view className, CMPIFlags flags,
+               ResultSink& sink);
+
+  /// Memory for further arguments: it lasts as long as the call.
+  [[nodiscard]] Arena& arena() { return request_.held(); }
 
   /// Calls the function of the provider's MI table, with what every function takes first and then
   /// `arguments`. CMPI_RC_ERR_FAILED where the provider cannot be had or throws, which CMPI does not know;
   /// CMPI_RC_ERR_NOT_SUPPORTED where it has no such function; else its own status.
   template <class MI, class Table, class Function, class... Arguments>
-  Status ask(const Route& route, MI& (ProviderLibrary::*mi)(), Function* Table::*member,
-             const Arguments&... arguments) {
+  Status ask(MI& (ProviderLibrary::*mi)(), Function* Table::*member, const Arguments&... arguments) {
     try {
-      MI& provider = (route.library->*mi)();
+      MI& provider = (route_.library->*mi)();
       Function* const function = provider.ft->*member;
       if (function == nullptr)
-        return notSupported(named(route) + " has no function for this request");
+        return notSupported(named(route_) + " has no function for this request");
       return run([&] { return function(&provider, context_, &result_, path_, arguments...); });
     } catch (const ProviderError& error) {
       return {CMPI_RC_ERR_FAILED, error.what()};
@@ -77,10 +77,9 @@ class ProviderCall {
 
   [[nodiscard]] const Result& result() const { return result_; }
 
-  /// The outcome of a call that ended with `status`. What was odd about the answer, which is `route`'s for
-  /// its own class, goes to the log.
-  [[nodiscard]] Outcome concluded(Status status, const Route& route, const Delivery& delivery,
-                                  const Log& log) const;
+  /// The outcome of a call that ended with `status`. What was odd about the answer is said.
+  [[nodiscard]] Outcome concluded(Status status, const Delivery& delivery,
+                                  const Diagnostics& diagnostics) const;
 
  private:
   template <class Operation>
@@ -94,6 +93,7 @@ class ProviderCall {
     }
   }
 
+  const Route& route_;
   Request request_;
   RequestScope scope_;
   Context* context_ = nullptr;

@@ -113,8 +113,10 @@ class RegistrationParser {
       takeTypes(section, value);
     else if (folded == "namespace")
       takeNameSpaces(section, value);
+    else if (folded == "keeps")
+      takeKeeps(section, value);
     else if (folded != "unload" && folded != "group" && folded != "user" && folded != "parameters")
-      fail("unknown entry '" + folded + ":'; known are provider, location, type, namespace");
+      fail("unknown entry '" + folded + ":'; known are provider, location, type, namespace, keeps");
   }
 
   [[nodiscard]] std::string plain(const std::string& name, std::string_view value) const {
@@ -132,6 +134,12 @@ class RegistrationParser {
       else
         fail("unknown type '" + type + "'; known are instance, association");
     }
+  }
+
+  void takeKeeps(ProviderRegistration& section, std::string_view value) const {
+    if (!sameName(value, "nothing"))
+      fail("'keeps: " + std::string(value) + "' means nothing here; known is 'keeps: nothing'");
+    section.keepsNothing = true;
   }
 
   static void takeNameSpaces(ProviderRegistration& section, std::string_view value) {

@@ -8,6 +8,14 @@
 //
 // One section for each class. A comment line starts with `#` or `;`. Types are any of `instance` and
 // `association`, divided by blanks; namespaces likewise.
+//
+//      keeps: nothing
+//
+// This entry, which is this object manager's own, says that the provider uses nothing again that it has
+// returned: neither the object nor whatever else it had made through the broker by then, copies that getters
+// gave it included. That memory is taken back at each return, so that it does not grow with the answer. What
+// the provider was called with and what its own requests to other providers were answered with stays until
+// the call ends. Without the entry everything does.
 #pragma once
 
 #include <filesystem>
@@ -26,6 +34,7 @@ struct ProviderRegistration {
   bool association = false;             ///< serves the association operations
   std::vector<std::string> nameSpaces;  ///< at least one, without a leading slash
   std::string where;                    ///< file and line of the section, for messages
+  bool keepsNothing = false;            ///< uses nothing again that it has returned
 
   friend bool operator==(const ProviderRegistration&, const ProviderRegistration&) = default;
 };

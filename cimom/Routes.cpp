@@ -20,7 +20,12 @@ Routes::Routes(const ClassRepository& schema, const Broker& broker,
                                 [&nameSpace](const auto& known) { return sameName(known.first, nameSpace); });
       if (found == nameSpaces_.end())
         found = nameSpaces_.emplace(nameSpaces_.end(), nameSpace, NameSpace());
-      const Route route{info, schema_.find(info->name()), each.instance, each.association, &serving};
+      const Route route{info,
+                        schema_.find(info->name()),
+                        each.instance,
+                        each.association,
+                        each.keepsNothing ? Recycling::OnReturn : Recycling::Off,
+                        &serving};
       if (!found->second.byClass.emplace(info, route).second)
         throw RegistrationError(each.where + ": class " + each.className + " is registered twice in " +
                                 nameSpace);

@@ -4,6 +4,7 @@
 #include <cimom/ProviderLibrary.h>
 #include <cimom/ProviderRegistration.h>
 #include <cimom/broker/ClassTable.h>
+#include <cimom/broker/Result.h>
 #include <cimom/mof/ClassRepository.h>
 
 #include <filesystem>
@@ -25,6 +26,7 @@ struct Route {
   const SchemaClass* schema = nullptr;  ///< the same class, as declared
   bool instance = false;
   bool association = false;
+  Recycling recycling = Recycling::Off;
   ProviderLibrary* library = nullptr;
 };
 

@@ -70,7 +70,7 @@ CMPIData getElementAt(const CMPIArray* handle, CMPICount index, CMPIStatus* stat
     return noData(status, CMPI_RC_ERR_NO_SUCH_PROPERTY);
   }
   setStatus(status, CMPI_RC_OK);
-  return copyData(arenaForAnswer(*array->arena()), array->elements()[index]);
+  return answerWith(*array->arena(), array->elements()[index]);
 }
 
 CMPIStatus setElementAt(CMPIArray* handle, CMPICount index, const CMPIValue* value, CMPIType type) {

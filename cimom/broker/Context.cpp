@@ -105,7 +105,7 @@ struct Calls {
       return noData(status, CMPI_RC_ERR_NOT_FOUND);
     }
     setStatus(status, CMPI_RC_OK);
-    return copyData(arenaForAnswer(*object->arena()), value->data);
+    return answerWith(*object->arena(), value->data);
   }
 
   static CMPIData getAt(const Handle* handle, CMPICount index, CMPIString** name, CMPIStatus* status) {
@@ -116,13 +116,12 @@ struct Calls {
     if (index >= object->entries().all().size()) {
       return noData(status, CMPI_RC_ERR_NOT_FOUND);
     }
-    Arena& arena = arenaForAnswer(*object->arena());
     const NamedValue& value = object->entries().all()[index];
     if (name != nullptr) {
-      *name = String::create(arena, value.name);
+      *name = String::create(arenaForCopies(*object->arena()), value.name);
     }
     setStatus(status, CMPI_RC_OK);
-    return copyData(arena, value.data);
+    return answerWith(*object->arena(), value.data);
   }
 
   static CMPICount count(const Handle* handle, CMPIStatus* status) {

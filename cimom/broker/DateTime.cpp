@@ -62,7 +62,7 @@ CMPIString* getStringFormat(const CMPIDateTime* handle, CMPIStatus* status) {
     return noObject(status, CMPI_RC_ERR_INVALID_HANDLE);
   }
   setStatus(status, CMPI_RC_OK);
-  return String::create(arenaForAnswer(*time->arena()), time->view());
+  return String::create(arenaForCopies(*time->arena()), time->view());
 }
 
 CMPIBoolean isInterval(const CMPIDateTime* handle, CMPIStatus* status) {

@@ -56,7 +56,7 @@ class EnumerationCalls {
       return noObject(status, CMPI_RC_ERR_INVALID_HANDLE);
     }
     Array* const array =
-        Array::create(arenaForAnswer(*enumeration->arena()), enumeration->size_, enumeration->type_);
+        Array::create(arenaForCopies(*enumeration->arena()), enumeration->size_, enumeration->type_);
     if (array == nullptr) {
       return noObject(status, CMPI_RC_ERR_FAILED);
     }

@@ -31,8 +31,7 @@ CMPIData getProperty(const CMPIInstance* handle, const char* name, CMPIStatus* s
   }
   setStatus(status, CMPI_RC_OK);
   const NamedValue* const property = instance->find(name);
-  return property == nullptr ? nullData(declared->type)
-                             : copyData(arenaForAnswer(*instance->arena()), property->data);
+  return property == nullptr ? nullData(declared->type) : answerWith(*instance->arena(), property->data);
 }
 
 CMPIData getPropertyAt(const CMPIInstance* handle, CMPICount index, CMPIString** name, CMPIStatus* status) {
@@ -43,13 +42,12 @@ CMPIData getPropertyAt(const CMPIInstance* handle, CMPICount index, CMPIString**
   if (index >= instance->properties().size()) {
     return noData(status, CMPI_RC_ERR_NO_SUCH_PROPERTY);
   }
-  Arena& arena = arenaForAnswer(*instance->arena());
   const NamedValue& property = instance->properties()[index];
   if (name != nullptr) {
     *name = instance->classInfo().find(property.name)->nameString;
   }
   setStatus(status, CMPI_RC_OK);
-  return copyData(arena, property.data);
+  return answerWith(*instance->arena(), property.data);
 }
 
 CMPICount getPropertyCount(const CMPIInstance* handle, CMPIStatus* status) {
@@ -79,7 +77,7 @@ CMPIObjectPath* getObjectPath(const CMPIInstance* handle, CMPIStatus* status) {
     return noObject(status, CMPI_RC_ERR_INVALID_HANDLE);
   }
   setStatus(status, CMPI_RC_OK);
-  return instance->path().copyTo(arenaForAnswer(*instance->arena()));
+  return instance->path().copyTo(arenaForCopies(*instance->arena()));
 }
 
 CMPIStatus setPropertyFilter(CMPIInstance* handle, const char** properties, const char** keys) {

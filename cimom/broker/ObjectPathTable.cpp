@@ -81,7 +81,7 @@ CMPIData getKey(const CMPIObjectPath* handle, const char* name, CMPIStatus* stat
     return noData(status, CMPI_RC_ERR_NOT_FOUND);
   }
   setStatus(status, CMPI_RC_OK);
-  return copyData(arenaForAnswer(*path->arena()), key->data);
+  return answerWith(*path->arena(), key->data);
 }
 
 CMPIData getKeyAt(const CMPIObjectPath* handle, CMPICount index, CMPIString** name, CMPIStatus* status) {
@@ -92,13 +92,12 @@ CMPIData getKeyAt(const CMPIObjectPath* handle, CMPICount index, CMPIString** na
   if (index >= path->keys().size()) {
     return noData(status, CMPI_RC_ERR_NOT_FOUND);
   }
-  Arena& arena = arenaForAnswer(*path->arena());
   const NamedValue& key = path->keys()[index];
   if (name != nullptr) {
-    *name = String::create(arena, key.name);
+    *name = String::create(arenaForCopies(*path->arena()), key.name);
   }
   setStatus(status, CMPI_RC_OK);
-  return copyData(arena, key.data);
+  return answerWith(*path->arena(), key.data);
 }
 
 CMPICount getKeyCount(const CMPIObjectPath* handle, CMPIStatus* status) {
@@ -159,7 +158,7 @@ CMPIString* toString(const CMPIObjectPath* handle, CMPIStatus* status) {
     return noObject(status, CMPI_RC_ERR_INVALID_HANDLE);
   }
   setStatus(status, CMPI_RC_OK);
-  return String::create(arenaForAnswer(*path->arena()), formatWbemUri(*path));
+  return String::create(arenaForCopies(*path->arena()), formatWbemUri(*path));
 }
 
 }  // namespace

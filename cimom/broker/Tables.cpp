@@ -1,4 +1,5 @@
 #include <cimom/broker/Tables.h>
+#include <cimom/broker/Values.h>
 
 namespace cimom {
 
@@ -36,6 +37,16 @@ CMPIData noData(CMPIStatus* status, CMPIrc code) {
 Arena& arenaForAnswer(Arena& home) {
   Request* const request = Request::current();
   return request == nullptr || request->owns(home) ? home : request->arena();
+}
+
+Arena& arenaForCopies(Arena& home) {
+  Request* const request = Request::current();
+  return request != nullptr && &home == &request->held() ? request->arena() : arenaForAnswer(home);
+}
+
+CMPIData answerWith(Arena& home, const CMPIData& data) {
+  const bool isMutable = (data.type & CMPI_ARRAY) != 0 || data.type == CMPI_ref || data.type == CMPI_instance;
+  return copyData(isMutable ? arenaForCopies(home) : arenaForAnswer(home), data);
 }
 
 }  // namespace cimom

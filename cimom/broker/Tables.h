@@ -44,6 +44,15 @@ inline std::nullptr_t noObject(CMPIStatus* status, CMPIrc code) {
 /// again does not grow.
 [[nodiscard]] Arena& arenaForAnswer(Arena& home);
 
+/// The same for what is copied anew with each asking, like the path of an instance. Of what the request holds
+/// to its end, copies go where they can be recycled: the answer of an upcall that is asked again for each
+/// object would grow with them.
+[[nodiscard]] Arena& arenaForCopies(Arena& home);
+
+/// `data`, a part of an object in `home`, as a getter returns it: immutable objects themselves where they
+/// live long enough, copies of all others.
+[[nodiscard]] CMPIData answerWith(Arena& home, const CMPIData& data);
+
 /// Who frees an object's arena: its `release`, for clones; nobody, for the objects of a request.
 struct Ownership {
   template <class Object>

@@ -57,6 +57,12 @@ TEST(ProviderRegistrations, takeLinesOfOtherSystems) {
       "P");
 }
 
+TEST(ProviderRegistrations, sayWhetherAProviderKeepsWhatItHasReturned) {
+  const std::string section = "[A]\nprovider: P\nlocation: L\ntype: instance\nnamespace: n\n";
+  EXPECT_FALSE(parseRegistrations(section, "a.reg").front().keepsNothing);
+  EXPECT_TRUE(parseRegistrations(section + "Keeps: Nothing\n", "a.reg").front().keepsNothing);
+}
+
 TEST(ProviderRegistrations, sayWhatIsWrongAndWhere) {
   EXPECT_EQ(complaint("provider: A"), "a.reg:1: 'provider:' stands before the first [CLASS]");
   EXPECT_EQ(complaint("\n[A"), "a.reg:2: expected the name of a class in brackets, got '[A'");
@@ -69,7 +75,9 @@ TEST(ProviderRegistrations, sayWhatIsWrongAndWhere) {
   EXPECT_EQ(complaint("[A]\nlocation: ../lib"), "a.reg:2: 'location: ../lib' is no plain name");
   EXPECT_EQ(complaint("[A]\nlocation: ..x"), "a.reg:2: 'location: ..x' is no plain name");
   EXPECT_EQ(complaint("[A]\nwhat: ever"),
-            "a.reg:2: unknown entry 'what:'; known are provider, location, type, namespace");
+            "a.reg:2: unknown entry 'what:'; known are provider, location, type, namespace, keeps");
+  EXPECT_EQ(complaint("[A]\nkeeps: all"),
+            "a.reg:2: 'keeps: all' means nothing here; known is 'keeps: nothing'");
   EXPECT_EQ(complaint("\n[A]\nprovider: P\nlocation: L\ntype: instance\n"),
             "a.reg:2: section [A] lacks 'namespace:'");
   EXPECT_EQ(complaint(std::string(sample) + "[a_one]"),
