@@ -37,6 +37,9 @@ struct EndpointSettings {
   /// The most that one open or pull delivers; a MaxObjectCount above it is taken for it.
   std::size_t objectsPerPull = 10000;
 
+  /// How long a part of an enumeration waits, once it is full, for what tells it whether there is more.
+  std::chrono::milliseconds lookAhead{200};
+
   /// Bytes of the body that are handed to the server at a time.
   std::size_t pieceSize = std::size_t{48} << 10U;
 
