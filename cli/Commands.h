@@ -15,5 +15,7 @@ void runTree(const Options& options, Output& output);
 void runCapture(const Options& options, Output& output);
 void runServe(const Options& options, Output& output);
 void runPasswd(const Options& options, Output& output);
+void runRegister(const Options& options, Output& output);
+void runUnregister(const Options& options, Output& output);
 
 }  // namespace cli

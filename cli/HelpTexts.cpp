@@ -1,4 +1,5 @@
 #include <cli/HelpTexts.h>
+#include <cli/RegisterHelp.h>
 #include <cli/ServeHelp.h>
 
 namespace cli {
@@ -19,6 +20,8 @@ Commands:
   capture FILE     save that tree as an inventory file
   serve            answer WBEM clients over HTTP
   passwd FILE USER set the password of a user of "serve"
+  register, unregister
+                   have another object manager load the providers, or not
 
 Options:
   --format table|json|csv  how to print (default: table; tree has no csv)
@@ -41,6 +44,8 @@ Options:
   --passwords FILE, --client-ca FILE, --max-connections N, --stall-time SECONDS
                            serve: where, to whom, and with which bounds
   --delete                 passwd: take the user out of the file
+  --for sfcb|pegasus, --print
+                           register, unregister: whose tools to run, or show
   --version                print the version and stop
   --help, -h               print this help; after a command, that command's help
 
@@ -260,6 +265,10 @@ std::string_view helpText(std::optional<Command> command) {
       return serveHelp;
     case Command::Passwd:
       return passwdHelp;
+    case Command::Register:
+      return registerHelp;
+    case Command::Unregister:
+      return unregisterHelp;
   }
   return programHelp;
 }
@@ -282,6 +291,10 @@ std::string_view commandName(Command command) {
       return "serve";
     case Command::Passwd:
       return "passwd";
+    case Command::Register:
+      return "register";
+    case Command::Unregister:
+      return "unregister";
   }
   return {};
 }

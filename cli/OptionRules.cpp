@@ -45,7 +45,9 @@ const std::vector<Rule>& rules() {
       {"--passwords", {Command::Serve}},
       {"--max-connections", {Command::Serve}},
       {"--stall-time", {Command::Serve}},
-      {"--delete", {Command::Passwd}}};
+      {"--delete", {Command::Passwd}},
+      {"--for", {Command::Register, Command::Unregister}},
+      {"--print", {Command::Register, Command::Unregister}}};
   return table;
 }
 

@@ -15,9 +15,9 @@
 namespace cli {
 namespace {
 
-constexpr std::array<Command, 8> commands{Command::List,        Command::Names, Command::Get,
-                                          Command::Associators, Command::Tree,  Command::Capture,
-                                          Command::Serve,       Command::Passwd};
+constexpr std::array<Command, 10> commands{
+    Command::List,    Command::Names, Command::Get,    Command::Associators, Command::Tree,
+    Command::Capture, Command::Serve, Command::Passwd, Command::Register,    Command::Unregister};
 
 /// The arguments as they were typed, before their values are looked at.
 struct Raw {
@@ -30,6 +30,7 @@ struct Raw {
   std::string logLevel;
   std::vector<std::string> schema;
   RawServe serve;
+  RawRegister registration;
 };
 
 /// The options stand in the program, and fall through to it from behind a command: they may stand anywhere.
@@ -56,6 +57,7 @@ std::unique_ptr<CLI::App> makeParser(Raw& raw) {
       ->allow_extra_args(false)
       ->multi_option_policy(CLI::MultiOptionPolicy::TakeAll);
   addServeOptions(*app, raw.serve);
+  addRegisterOptions(*app, raw.registration);
   app->fallthrough();
   app->require_subcommand(0, 1);
   for (const Command command : commands) {
@@ -149,7 +151,9 @@ Options interpret(const CLI::App& app, Raw raw) {
   const std::optional<Command> command = commandOf(app);
   if (!command) {
     throw UsageError(
-        "no command given; there are list, names, get, associators, tree, capture, serve and passwd");
+        "no command given; there are list, names, get, associators, tree, capture, serve, passwd, register "
+        "and "
+        "unregister");
   }
   checkThatOptionsApply(app, *command);
   Options options = std::move(raw.options);
@@ -178,6 +182,9 @@ Options interpret(const CLI::App& app, Raw raw) {
   }
   options.serve = interpretServe(app, raw.serve);
   options.passwd = raw.serve.passwd;
+  if (*command == Command::Register || *command == Command::Unregister) {
+    options.registration = interpretRegister(raw.registration, std::string(commandName(*command)));
+  }
   checkNames(app, options);
   checkArguments(options);
   return options;

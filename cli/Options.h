@@ -1,6 +1,7 @@
 // The command line: which command, with what.
 #pragma once
 
+#include <cli/RegisterOptions.h>
 #include <cli/ServeOptions.h>
 
 #include <filesystem>
@@ -10,7 +11,7 @@
 
 namespace cli {
 
-enum class Command { List, Names, Get, Associators, Tree, Capture, Serve, Passwd };
+enum class Command { List, Names, Get, Associators, Tree, Capture, Serve, Passwd, Register, Unregister };
 enum class Format { Table, Json, Csv };
 enum class LogLevel { Off, Error, Trace };
 
@@ -35,6 +36,7 @@ struct Options {
   std::optional<LogLevel> logLevel;               ///< none: off; of serve: error
   ServeOptions serve;
   PasswdOptions passwd;
+  RegisterOptions registration;
 };
 
 /// What a command line asks for: a command, or (without options) that `standardOutput` and `standardError` be

@@ -39,6 +39,10 @@ void run(const cli::Options& options, cli::Output& output) {
       return cli::runTree(options, output);
     case cli::Command::Capture:
       return cli::runCapture(options, output);
+    case cli::Command::Register:
+      return cli::runRegister(options, output);
+    case cli::Command::Unregister:
+      return cli::runUnregister(options, output);
     case cli::Command::Serve:
     case cli::Command::Passwd:
 #ifdef SWINV_HAS_ENDPOINT

@@ -17,8 +17,9 @@ using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
 
-constexpr std::array allCommands{Command::List, Command::Names,   Command::Get,   Command::Associators,
-                                 Command::Tree, Command::Capture, Command::Serve, Command::Passwd};
+constexpr std::array allCommands{Command::List,     Command::Names,     Command::Get,   Command::Associators,
+                                 Command::Tree,     Command::Capture,   Command::Serve, Command::Passwd,
+                                 Command::Register, Command::Unregister};
 
 CommandLine parse(std::vector<std::string> arguments) {
   return cli::parseCommandLine(std::move(arguments));

@@ -120,6 +120,7 @@ TEST_P(Registrations, ForSfcbHaveTheFourEntriesAlone) {
 
 TEST_P(Registrations, ForPegasusNameTheLibraryAndTheInterface) {
   const InstanceDeclaration module = theOne("PG_ProviderModule");
+  EXPECT_EQ(valueOf(module, "Name"), std::string(GetParam()) + "Module") << "as swinv register calls it";
   EXPECT_EQ(valueOf(module, "Vendor"), "Kelvo");
   EXPECT_EQ(valueOf(module, "Version"), SWINV_VERSION);
   EXPECT_EQ(valueOf(module, "InterfaceType"), "CMPI");
