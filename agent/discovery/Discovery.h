@@ -34,7 +34,7 @@ struct DiscoveryOptions {
   /// Empty: the running kernel's where the root is "/", else none.
   discovery::IpmiOpener ipmi;
 
-  /// Null: libkmod over root/lib/modules/RELEASE.
+  /// Null: libkmod over root/lib/modules/RELEASE; on the running system, only where it shows no sys/module.
   std::shared_ptr<discovery::ModuleDatabase> modules;
 };
 

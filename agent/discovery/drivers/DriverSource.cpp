@@ -94,7 +94,7 @@ std::shared_ptr<ModuleDatabase> openDatabase(SourceContext& context, const std::
   std::shared_ptr<ModuleDatabase> database = makeModuleDatabase(context.root().outside(*resolved.value));
   if (database == nullptr) {
     context.report(context.root().outside(folder), SourceReport::Reason::Unreadable,
-                   "libkmod cannot open it");
+                   "libkmod cannot open it, or is not installed");
   }
   return database;
 }
@@ -111,11 +111,19 @@ void askDatabase(SourceContext& context, ModuleDatabase& modules, const std::str
   }
 }
 
+/// Whether a version that sysfs lacks is none. The running kernel shows there the version of every module,
+/// loaded or built in, that has one: it takes it from the section of the module's file that libkmod reads. So
+/// the files, which cost the most of a look, could tell nothing else, or that of a file that was replaced
+/// since. A copy of another machine's sysfs may lack what it likes.
+bool kernelTellsAll(SourceContext& context) {
+  return context.root().isLive() && !context.list("sys/module").empty();
+}
+
 /// The versions that sysfs lacks: what the module files tell, else the release of the kernel that brought
 /// them.
 void completeVersions(SourceContext& context, std::shared_ptr<ModuleDatabase> modules, Drivers& drivers) {
   const std::optional<std::string> release = context.text("proc/sys/kernel/osrelease");
-  if (modules == nullptr && release) {
+  if (modules == nullptr && release && !kernelTellsAll(context)) {
     modules = openDatabase(context, *release);
   }
   for (auto& [key, driver] : drivers) {
@@ -140,12 +148,11 @@ void readDrivers(SourceContext& context, std::shared_ptr<ModuleDatabase> modules
     driver.version = context.textIfAny("sys/module/" + key + "/version");
     complete = complete && driver.version;
   }
-  context.result().nodes = nodesOf(drivers);
-  if (complete) {
-    return;
+  if (!complete) {
+    context.result().nodes = nodesOf(drivers);
+    context.publish();  // module files may lie on a slow disk
+    completeVersions(context, std::move(modules), drivers);
   }
-  context.publish();  // module files may lie on a slow disk
-  completeVersions(context, std::move(modules), drivers);
   context.result().nodes = nodesOf(drivers);
 }
 

@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <cerrno>
+#include <string>
 
 namespace agent::discovery::test {
 namespace {
@@ -43,6 +44,19 @@ TEST(DriverSource, VersionIsSysfsThenTheDatabasesThenTheKernels) {
   44 two driver 108="two" 134="2.2" 1000="pci:1"
 )");
   EXPECT_EQ(reportOn(tree, "drivers", ""), std::nullopt);
+}
+
+TEST(DriverSource, OnTheRunningSystemModuleFilesAreNotLookedFor) {
+  const SystemRoot system("/");
+  const std::string release = system.read("proc/sys/kernel/osrelease").value.value_or("\n");
+  // On a machine without module files a look for them would be told; with them, nothing may be opened.
+  const std::string folder = "/lib/modules/" + release.substr(0, release.find('\n'));
+  ASSERT_TRUE(system.list("sys/module")) << "the test needs a system that shows its modules";
+  EXPECT_EQ(reportOn(discover(), "drivers", folder), std::nullopt);
+
+  Machine machine(kernel);
+  machine.add(bound("0", "one") + ofModule("one", "one") + "sys/module/one/initstate = live\n");
+  EXPECT_TRUE(reportOn(discoverAt(machine), "drivers", "/lib/modules/6.1.0"));
 }
 
 TEST(DriverSource, DriversOfOneModuleAreOneNode) {
