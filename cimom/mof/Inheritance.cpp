@@ -112,9 +112,17 @@ class Merge {
     result_.properties = result_.superclass->properties;
     result_.methods = result_.superclass->methods;
     for (Property& each : result_.properties)
-      each.qualifiers = merged(each.qualifiers, {}, known_, here());
+      dropOwnOnly(each.qualifiers);
     for (Method& each : result_.methods)
-      each.qualifiers = merged(each.qualifiers, {}, known_, here());
+      dropOwnOnly(each.qualifiers);
+  }
+
+  /// Leaves those that subclasses inherit.
+  void dropOwnOnly(Qualifiers& qualifiers) const {
+    std::erase_if(qualifiers, [this](const Qualifier& each) {
+      const QualifierDeclaration* declaration = known_.findQualifierDeclaration(each.name);
+      return declaration == nullptr || !declaration->toSubclass();
+    });
   }
 
   void addProperty(std::size_t index) {
