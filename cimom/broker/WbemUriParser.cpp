@@ -1,11 +1,8 @@
-#include <cimom/broker/Values.h>
+#include <cimom/broker/NumberText.h>
 #include <cimom/broker/WbemUri.h>
 
 #include <algorithm>
 #include <charconv>
-#include <cmath>
-#include <limits>
-#include <optional>
 
 namespace cimom {
 
@@ -26,51 +23,6 @@ bool isNameSpaceCharacter(char character) {
 }
 bool isNumberCharacter(char character) {
   return isNameCharacter(character) || character == '+' || character == '-' || character == '.';
-}
-
-template <class Number>
-std::optional<Number> wholeNumber(std::string_view text) {
-  if (text.size() > 1 && text[0] == '+' && text[1] != '-') {
-    text.remove_prefix(1);
-  }
-  Number number{};
-  const auto result = std::from_chars(text.data(), text.data() + text.size(), number);
-  const bool isWhole = result.ec == std::errc() && result.ptr == text.data() + text.size();
-  return isWhole && !text.empty() ? std::optional(number) : std::nullopt;
-}
-
-// Gives a key the integer type that its class declares, where the number fits it.
-template <class Type>
-bool fits(Integer number) {
-  if (number.isNegative) {
-    return std::numeric_limits<Type>::is_signed &&
-           static_cast<std::int64_t>(number.bits) >=
-               static_cast<std::int64_t>(std::numeric_limits<Type>::min());
-  }
-  return number.bits <= static_cast<std::uint64_t>(std::numeric_limits<Type>::max());
-}
-
-bool fitsType(Integer number, CMPIType type) {
-  switch (type) {
-    case CMPI_uint8:
-      return fits<CMPIUint8>(number);
-    case CMPI_uint16:
-      return fits<CMPIUint16>(number);
-    case CMPI_uint32:
-      return fits<CMPIUint32>(number);
-    case CMPI_uint64:
-      return fits<CMPIUint64>(number);
-    case CMPI_sint8:
-      return fits<CMPISint8>(number);
-    case CMPI_sint16:
-      return fits<CMPISint16>(number);
-    case CMPI_sint32:
-      return fits<CMPISint32>(number);
-    case CMPI_sint64:
-      return fits<CMPISint64>(number);
-    default:
-      return false;
-  }
 }
 
 class Parser {
@@ -200,7 +152,7 @@ class Parser {
       data.value.boolean = sameName(word, "true") ? 1 : 0;
       return data;
     }
-    if (!readNumber(word, declared, data)) {
+    if (!readKeyNumber(word, declared, data)) {
       position_ = start;
       fail("a value: text in double quotes, a character in single ones, a number, true or false");
     }
@@ -286,43 +238,6 @@ class Parser {
     }
     position_ += static_cast<std::size_t>(result.ptr - digits.data());
     return character;
-  }
-
-  static bool readNumber(std::string_view word, CMPIType declared, CMPIData& data) {
-    const bool isReal = declared == CMPI_real32 || declared == CMPI_real64;
-    const auto signedNumber = wholeNumber<std::int64_t>(word);
-    const auto unsignedNumber = wholeNumber<std::uint64_t>(word);
-    if (isReal || (!signedNumber && !unsignedNumber)) {
-      return readReal(word, declared, data);
-    }
-    const bool isNegative = signedNumber && *signedNumber < 0;
-    const Integer number{isNegative,
-                         isNegative ? static_cast<std::uint64_t>(*signedNumber) : *unsignedNumber};
-    data.value.uint64 = number.bits;  // the narrower members are its low bytes
-    data.type = signedNumber ? CMPI_sint64 : CMPI_uint64;
-    if (fitsType(number, declared)) {
-      data.type = declared;
-    }
-    return true;
-  }
-
-  static bool readReal(std::string_view word, CMPIType declared, CMPIData& data) {
-    const bool isInteger = word.find_first_not_of("+-0123456789") == std::string_view::npos;
-    const bool startsAsNumber = !word.empty() && (isDigit(word[0]) || word.find_first_of(".+-") == 0 ||
-                                                  sameName(word, "inf") || sameName(word, "nan"));
-    if (!startsAsNumber || (isInteger && declared != CMPI_real32 && declared != CMPI_real64)) {
-      return false;
-    }
-    if (declared == CMPI_real32) {
-      const auto number = wholeNumber<float>(word);
-      data.type = CMPI_real32;
-      data.value.real32 = number.value_or(0);
-      return number.has_value();
-    }
-    const auto number = wholeNumber<double>(word);
-    data.type = CMPI_real64;
-    data.value.real64 = number.value_or(0);
-    return number.has_value();
   }
 
   Arena& arena_;
