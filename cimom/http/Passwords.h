@@ -40,6 +40,12 @@ class Passwords {
   std::string nobody_;  ///< what passwords of unknown users are hashed against
 };
 
+/// Whether a user may be called so.
+[[nodiscard]] bool isUserName(std::string_view name);
+
+/// A new salted yescrypt hash. Throws PasswordError for a password that is empty, too long or has a NUL.
+[[nodiscard]] std::string hashPassword(std::string_view password);
+
 /// Adds a user or changes the password of one; makes the file (mode 0600) where there is none. An existing
 /// file keeps its comments, owner and mode, and is replaced in one step: a reader sees the old or the new.
 /// Throws PasswordError. True: the user is new.
