@@ -1,6 +1,7 @@
 #include <agent/endpoints/Failure.h>
 #include <agent/endpoints/RequestPath.h>
 #include <agent/framework/CmpiAccess.h>
+#include <agent/framework/NodeTree.h>
 
 #include <Oru/ProviderUtilities.h>
 #include <cmpi/cmpift.h>
@@ -14,17 +15,9 @@ RequestPath::RequestPath(const CMPIObjectPath* path, const Kind& kind)
   for (const char* name : kind.keyNames) {
     wanted_.push_back({name, false, std::nullopt});
   }
-  const auto* table = cmpi::tableOf(path);
-  CMPIStatus status{CMPI_RC_OK, nullptr};
-  const CMPICount count = table->getKeyCount(path, &status);
-  for (CMPICount index = 0; status.rc == CMPI_RC_OK && index < count; ++index) {
-    CMPIString* name = nullptr;
-    const CMPIData value = table->getKeyAt(path, index, &name, &status);
-    if (status.rc == CMPI_RC_OK) {
-      take(cmpi::charsOf(name), value);
-    }
-  }
-  if (nameSpace_.empty() || status.rc != CMPI_RC_OK) {
+  const bool isCounted =
+      cmpi::forEachKey(path, [this](const char* name, const CMPIData& value) { take(name, value); });
+  if (nameSpace_.empty() || !isCounted) {
     throw Failure(CMPI_RC_ERR_FAILED, std::string("the object manager does not tell the ") +
                                           (nameSpace_.empty() ? "namespace" : "keys") +
                                           " of the request's path");
@@ -62,7 +55,7 @@ std::string RequestPath::text() const {
   for (const Wanted& wanted : wanted_) {
     if (wanted.isGiven) {
       text.append(text.empty() ? "" : ",").append(wanted.name).append("=");
-      text.append(wanted.value ? "\"" + *wanted.value + "\"" : "(no text)");
+      text.append(wanted.value ? "\"" + cleanText(*wanted.value) + "\"" : "(no text)");
     }
   }
   return text;

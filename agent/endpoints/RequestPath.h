@@ -14,8 +14,8 @@ namespace agent::endpoints {
 class RequestPath {
  public:
   /// Reads the namespace and the keys of `kind` from `path`; other keys say nothing about its elements and
-  /// are left out. Throws `Failure` where these cannot be read: a key that is overlooked would let elements
-  /// pass that nobody asked for.
+  /// are left out, and one that cannot be read is one that is not set. Throws `Failure` where the namespace
+  /// or the number of keys cannot be had.
   RequestPath(const CMPIObjectPath* path, const Kind& kind);
 
   /// Whether an element has every value that the path gives. Values are compared exactly, class names too; a
@@ -27,7 +27,7 @@ class RequestPath {
   /// The first key that the path lacks, or null: then it names one element.
   [[nodiscard]] const char* missingKey() const;
 
-  /// The keys that it gives, for messages: `Name="atlas"`.
+  /// The keys that it gives, for messages: `Name="atlas"`. What a client sent is made valid UTF-8.
   [[nodiscard]] std::string text() const;
 
  private:

@@ -100,4 +100,26 @@ std::optional<CMPIData> findByName(const Object* object, const char* name, GetNa
   return std::nullopt;
 }
 
+/// Shows each key of a path that can be read: its name, null where that cannot be had, and its value. Object
+/// managers may count the keys of the path's class, set or not; reading one that is not set is an error then.
+/// False where the number of keys cannot be had.
+template <typename Visit>
+bool forEachKey(const CMPIObjectPath* path, Visit visit) {
+  const auto* table = tableOf(path);
+  if (table == nullptr || table->getKeyCount == nullptr || table->getKeyAt == nullptr) {
+    return false;
+  }
+  CMPIStatus counted{CMPI_RC_OK, nullptr};
+  const CMPICount count = table->getKeyCount(path, &counted);
+  for (CMPICount index = 0; counted.rc == CMPI_RC_OK && index < count; ++index) {
+    CMPIStatus status{CMPI_RC_OK, nullptr};
+    CMPIString* name = nullptr;
+    const CMPIData value = table->getKeyAt(path, index, &name, &status);
+    if (status.rc == CMPI_RC_OK) {
+      visit(charsOf(name), value);
+    }
+  }
+  return counted.rc == CMPI_RC_OK;
+}
+
 }  // namespace agent::cmpi

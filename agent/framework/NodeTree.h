@@ -280,8 +280,9 @@ class NodeTreeBuilder {
 /// folded onto the lower ones. 0 and 1 are taken for this and read as 2 and 3.
 NodeNumber numberFor(int type, std::string_view position, std::uint32_t n = 1);
 
-/// `text` without blanks and control characters at both ends, made valid UTF-8 (each byte that is not becomes
-/// U+FFFD), with a blank in place of each control character inside.
+/// `text` without blanks and control characters at both ends, made valid UTF-8 that any XML can hold (each
+/// byte that is not becomes U+FFFD, and so do U+FFFE and U+FFFF), with a blank in place of each control
+/// character inside.
 std::string cleanText(std::string_view text);
 
 /// The path text of a number: lower-case hexadecimal without leading zeros.

@@ -13,8 +13,8 @@ namespace Oru {
 namespace {
 
 using agent::cmpi::charsOf;
-using agent::cmpi::countOf;
 using agent::cmpi::findByName;
+using agent::cmpi::forEachKey;
 using agent::cmpi::hasValue;
 using agent::cmpi::sameName;
 using agent::cmpi::tableOf;
@@ -162,12 +162,11 @@ std::string ProviderUtilities::getNamespace(const CMPIObjectPath* path) {
 }
 
 unsigned short ProviderUtilities::getKeyCount(const CMPIObjectPath* path) {
-  const auto* table = tableOf(path);
-  if (table == nullptr) {
-    return 0;
-  }
-  constexpr CMPICount most = std::numeric_limits<unsigned short>::max();
-  return static_cast<unsigned short>(std::min(countOf<CMPIObjectPath>(path, table->getKeyCount), most));
+  constexpr unsigned int most = std::numeric_limits<unsigned short>::max();
+  unsigned int count = 0;
+  forEachKey(path,
+             [&count](const char* /*name*/, const CMPIData& value) { count += hasValue(value) ? 1 : 0; });
+  return static_cast<unsigned short>(std::min(count, most));
 }
 
 bool ProviderUtilities::getKeyProperty(const CMPIObjectPath* path, const char* name, std::string& value) {
@@ -285,24 +284,15 @@ void ProviderUtilities::setProperty(const CMPIBroker* broker, CMPIInstance* inst
 }
 
 void ProviderUtilities::transformObjectPathToMoniker(const CMPIObjectPath* path, Moniker& moniker) {
-  const auto* table = tableOf(path);
-  if (table == nullptr || table->getKeyAt == nullptr) {
-    return;
-  }
-  const CMPICount count = countOf<CMPIObjectPath>(path, table->getKeyCount);
-  for (CMPICount index = 0; index < count; ++index) {
-    CMPIStatus status{CMPI_RC_OK, nullptr};
-    CMPIString* keyName = nullptr;
-    const CMPIData data = table->getKeyAt(path, index, &keyName, &status);
-    const char* name = status.rc == CMPI_RC_OK ? charsOf(keyName) : nullptr;
+  forEachKey(path, [&moniker](const char* name, const CMPIData& data) {
     const char* value = name == nullptr ? nullptr : charsOf(data);
     if (value == nullptr) {
-      continue;
+      return;
     }
     const auto* known = std::find_if(monikerKeys.begin(), monikerKeys.end(),
                                      [name](std::string_view key) { return sameName(key, name); });
     moniker.addKey(known == monikerKeys.end() ? std::string(name) : std::string(*known), value);
-  }
+  });
 }
 
 void ProviderUtilities::transformMonikerToObjectPath(Moniker& moniker, CMPIObjectPath** path) {

@@ -67,6 +67,10 @@ Character firstCharacter(std::string_view text) {
       return {1, false, false};
     }
   }
+  // U+FFFE and U+FFFF are no characters, and stand in no XML.
+  if (first == 0xEF && second == 0xBF && asByte(text[2]) >= 0xBE) {
+    return {sequence.length, false, false};
+  }
   // U+0080 to U+009F are control characters too.
   return {sequence.length, true, first == 0xC2 && second < 0xA0};
 }

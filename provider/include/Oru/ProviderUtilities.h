@@ -33,7 +33,7 @@ class ProviderUtilities {
   /// The path's namespace; empty where it has none.
   static std::string getNamespace(const CMPIObjectPath* path);
 
-  /// Number of keys; 0 for a class path.
+  /// Number of keys that have a value; 0 for a class path, whatever an object manager counts there.
   static unsigned short getKeyCount(const CMPIObjectPath* path);
 
   /// Reads a string key into `value`. False when it is missing, null, or not a string.

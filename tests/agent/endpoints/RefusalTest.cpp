@@ -108,9 +108,24 @@ INSTANTIATE_TEST_SUITE_P(
                     std::pair("newArray", Fault::Null), std::pair("newArray", Fault::Both),
                     std::pair("setElementAt", Fault::Status), std::pair("addKey", Fault::Status),
                     std::pair("setProperty", Fault::Status), std::pair("getKeyCount", Fault::Status),
-                    std::pair("getKeyAt", Fault::Both), std::pair("getNameSpace", Fault::Both),
-                    std::pair("getClassName", Fault::Both)),
+                    std::pair("getNameSpace", Fault::Both), std::pair("getClassName", Fault::Both)),
     nameOf);
+
+// Object managers count keys of a path that nobody has set, and fail to read them.
+TEST_F(Refusals, AKeyThatCannotBeReadIsNotSet) {
+  const CMPIObjectPath* whole =
+      path(computers, {{"CreationClassName", "KELVO_ComputerSystem"}, {"Name", "atlas"}});
+  cmpi.faults["getKeyAt"] = FakeCmpi::Fault::Both;
+  EXPECT_EQ(get(whole).status, CMPI_RC_ERR_INVALID_PARAMETER);
+  EXPECT_EQ(enumerate(whole).instances.size(), enumerate(computers).instances.size());
+}
+
+TEST_F(Refusals, WhatAClientSentIsCleanInAMessage) {
+  const Answer answer =
+      get(computers, {{"CreationClassName", "KELVO_ComputerSystem"}, {"Name", "a\xFF\n\xEF\xBF\xBFz"}});
+  EXPECT_EQ(answer.status, CMPI_RC_ERR_NOT_FOUND);
+  EXPECT_THAT(answer.message, HasSubstr("Name=\"a\xEF\xBF\xBD \xEF\xBF\xBDz\""));
+}
 
 TEST_F(Refusals, NamesFailWhereAKeyCannotBeSet) {
   cmpi.faults["addKey"] = FakeCmpi::Fault::Status;

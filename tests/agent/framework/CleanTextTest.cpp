@@ -44,6 +44,13 @@ TEST(CleanText, ReplacesEachByteThatIsNotUtf8) {
   EXPECT_EQ(cleanText("\xE2\x82z"), replaced + replaced + "z");
 }
 
+TEST(CleanText, ReplacesWhatNoXmlHolds) {
+  EXPECT_EQ(cleanText("a\xEF\xBF\xBEz"), "a" + replaced + "z") << "U+FFFE";
+  EXPECT_EQ(cleanText("\xEF\xBF\xBF"), replaced) << "U+FFFF";
+  EXPECT_EQ(cleanText("\xEF\xBF\xBD\xEF\xBB\xBF"), "\xEF\xBF\xBD\xEF\xBB\xBF") << "U+FFFD and U+FEFF";
+  EXPECT_EQ(cleanText("\xF0\x9F\xBF\xBF"), "\xF0\x9F\xBF\xBF") << "U+1FFFF";
+}
+
 TEST(CleanText, CleansOnceAndForAll) {
   std::mt19937 random(7);
   for (int i = 0; i < 20'000; ++i) {

@@ -156,7 +156,14 @@ TEST_F(ProviderUtilitiesTest, keyCount) {
   EXPECT_EQ(ProviderUtilities::getKeyCount(nullptr), 0);
   cmpi.faults = {{"getKeyCount", Fault::Status}};
   EXPECT_EQ(ProviderUtilities::getKeyCount(path), 0);
+  cmpi.faults.clear();
+  cmpi.setKey(path, "Unset", {CMPI_string, CMPI_nullValue, {}});
+  EXPECT_EQ(ProviderUtilities::getKeyCount(path), 2) << "a null is no key";
   cmpi.pathTable.getKeyCount = [](const CMPIObjectPath*, CMPIStatus*) -> CMPICount { return 65536; };
+  EXPECT_EQ(ProviderUtilities::getKeyCount(path), 2) << "one that cannot be read neither";
+  cmpi.pathTable.getKeyAt = [](const CMPIObjectPath*, CMPICount, CMPIString**, CMPIStatus*) {
+    return CMPIData{CMPI_uint8, CMPI_goodValue, {}};
+  };
   EXPECT_EQ(ProviderUtilities::getKeyCount(path), 65535);
   cmpi.pathTable.getKeyCount = nullptr;
   EXPECT_EQ(ProviderUtilities::getKeyCount(path), 0);
