@@ -8,7 +8,11 @@ Timer::Timer() : thread_([this] { run(); }) {}
 
 void Timer::at(Clock::time_point time, std::function<void()> work) {
   const std::lock_guard lock(mutex_);
-  if (!stopped_ && work_.emplace(time, std::move(work)) == work_.begin()) {
+  if (stopped_) {
+    return;
+  }
+  const auto added = work_.emplace(time, std::move(work));
+  if (added == work_.begin()) {
     changed_.notify_one();
   }
 }

@@ -64,7 +64,7 @@ class FakeCmpi {
   std::map<std::string, Fault> faults;          ///< by table member; each of its calls fails so
   std::vector<std::string> calls;               ///< table members, in the order of their calls
 
- private:
+ protected:
   struct Entry {
     std::string name;
     CMPIData data;
