@@ -87,6 +87,9 @@ Status Associations::resolve(const Asked& asked, const AssociationFilter& filter
   query.routes = routes.associations(asked.path.nameSpace(), top);
   if (query.routes.empty() && top != nullptr && !routes.schema().find(top->name())->isAssociation())
     return invalid("class " + std::string(top->name()) + " is no association");
+  std::erase_if(query.routes, [&](const Route* route) {
+    return route->isDeclared() && !dispatcher_.declared().concern(*route, asked.path);
+  });
   if (const char* name = query.filter.resultClass) {
     query.resultClass = routes.classes().find(name);
     if (query.resultClass == nullptr)
@@ -121,7 +124,7 @@ Roles Associations::roles(const Route& route, const Asked& asked) const {
     return *std::move(known);
   const ClassTable& classes = dispatcher_.routes().classes();
   Roles result(route, classes);
-  if (!route.instance || Learning::isUnderWay())
+  if (!route.instance || route.isDeclared() || Learning::isUnderWay())
     return result;
   const Learning learning;
   Arena arena;
@@ -151,6 +154,8 @@ Outcome Associations::associators(Kind kind, const Asked& asked, const Associati
   return askEach(query.routes, delivery, [&](const Route& route) {
     const auto known = roles.find(&route);
     delivery.startAnswer(known == roles.end() ? nullptr : &known->second);
+    if (route.isDeclared())
+      return dispatcher_.declared().associators(kind, asked, route, query.filter, delivery);
     ProviderCall call(route, asked, asked.path.className(), 0, delivery);
     const char* const association = route.info->name().data();
     Status status =
@@ -178,6 +183,8 @@ Outcome Associations::references(Kind kind, const Asked& asked, const Associatio
   ReferenceDelivery delivery(kind, sink, asked.properties, asked.path, role);
   return askEach(query.routes, delivery, [&](const Route& route) {
     delivery.startRoute(routes, route, *route.info, asked.path.nameSpace());
+    if (route.isDeclared())
+      return dispatcher_.declared().references(kind, asked, route, role, delivery);
     ProviderCall call(route, asked, asked.path.className(), 0, delivery);
     const char* const association = route.info->name().data();
     Status status = kind == Kind::Instances

@@ -53,6 +53,11 @@ const Route* Changes::routeTo(const ObjectPath& path, Keys keys, Status& status)
   if (status.code != CMPI_RC_OK)
     return nullptr;
   const Route* const route = dispatcher_.routes().find(path.nameSpace(), *path.classInfo());
+  if (route != nullptr && route->isDeclared()) {
+    status =
+        notSupported("instances of class " + std::string(path.className()) + " are declared in the schema");
+    return nullptr;
+  }
   if (route != nullptr && route->instance)
     return route;
   status = notSupported("no provider is registered for class " + std::string(path.className()));

@@ -32,6 +32,8 @@ Outcome Dispatcher::enumerate(Kind kind, const Asked& asked, ResultSink& sink) c
   EnumerationDelivery delivery(kind, sink, asked.properties);
   return askEach(routes, delivery, [&](const Route& route) {
     delivery.startRoute(*routes_, route, *path.classInfo(), path.nameSpace());
+    if (route.isDeclared())
+      return declared_.enumerate(kind, asked, route, delivery);
     ProviderCall call(route, asked, route.info->name(), CMPI_FLAG_DeepInheritance, delivery);
     Status status =
         kind == Kind::Instances
@@ -55,13 +57,18 @@ Outcome Dispatcher::get(const Asked& asked, ResultSink& sink) const {
   return getFrom(asked, *route, sink);
 }
 
+Outcome Dispatcher::ask(const Asked& asked, const Route& route, ResultSink& answer) const {
+  if (route.isDeclared())
+    return {declared_.get(asked, route, answer), true, 0};
+  ProviderCall call(route, asked, route.info->name(), 0, answer);
+  Status status = call.ask(&ProviderLibrary::instanceMI, &CMPIInstanceMIFT::getInstance, asked.properties);
+  return {std::move(status), call.result().done(), 0};
+}
+
 Outcome Dispatcher::getFrom(const Asked& asked, const Route& route, ResultSink& sink) const {
   Arena arena;
   SingleAnswer answer(arena);
-  ProviderCall call(route, asked, route.info->name(), 0, answer);
-  Outcome outcome;
-  outcome.status = call.ask(&ProviderLibrary::instanceMI, &CMPIInstanceMIFT::getInstance, asked.properties);
-  outcome.done = call.result().done();
+  Outcome outcome = ask(asked, route, answer);
   if (outcome.status.code != CMPI_RC_OK)
     return outcome;
   if (!outcome.done)

@@ -6,6 +6,7 @@
 
 #include <cimom/Associations.h>
 #include <cimom/Changes.h>
+#include <cimom/DeclaredAnswers.h>
 #include <cimom/Outcome.h>
 #include <cimom/ProviderCall.h>
 #include <cimom/Routes.h>
@@ -21,7 +22,8 @@ namespace cimom {
 
 class Dispatcher final : public UpcallTarget {
  public:
-  explicit Dispatcher(Log log) : diagnostics_(std::move(log)), associations_(*this), changes_(*this) {}
+  explicit Dispatcher(Log log)
+      : diagnostics_(std::move(log)), associations_(*this), changes_(*this), declared_(*this) {}
 
   /// Called once, before the first request: the routes need the broker, which needs this.
   void setRoutes(const Routes& routes) { routes_ = &routes; }
@@ -36,6 +38,7 @@ class Dispatcher final : public UpcallTarget {
 
   [[nodiscard]] const Associations& associations() const { return associations_; }
   [[nodiscard]] const Changes& changes() const { return changes_; }
+  [[nodiscard]] const DeclaredAnswers& declared() const { return declared_; }
 
   /// CMPI_RC_ERR_INVALID_NAMESPACE or CMPI_RC_ERR_INVALID_CLASS for a path whose namespace or class nobody
   /// knows, CMPI_RC_ERR_FAILED where providers ask each other too deep.
@@ -70,11 +73,13 @@ class Dispatcher final : public UpcallTarget {
 
  private:
   Outcome getFrom(const Asked& asked, const Route& route, ResultSink& sink) const;
+  Outcome ask(const Asked& asked, const Route& route, ResultSink& answer) const;
 
   Diagnostics diagnostics_;
   const Routes* routes_ = nullptr;
   Associations associations_;
   Changes changes_;
+  DeclaredAnswers declared_;
 };
 
 }  // namespace cimom

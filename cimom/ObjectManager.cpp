@@ -1,4 +1,6 @@
+#include <cimom/DeclaredInstances.h>
 #include <cimom/Dispatcher.h>
+#include <cimom/Names.h>
 #include <cimom/ObjectManager.h>
 #include <cimom/QueryText.h>
 #include <cimom/Routes.h>
@@ -19,6 +21,40 @@ ClassRepository compiled(const std::vector<std::filesystem::path>& schema) {
     repository.compileFile(file);
   repository.checkReferences();
   return repository;
+}
+
+/// The namespaces of registrations and declarations, and then the interop one.
+std::vector<std::string> nameSpacesOf(const Configuration& configuration, const ClassRepository& repository) {
+  std::vector<std::string> names;
+  const auto add = [&](const std::string& name) {
+    if (std::none_of(names.begin(), names.end(), [&](const auto& known) { return sameName(known, name); }))
+      names.push_back(name);
+  };
+  for (const ProviderRegistration& each : configuration.providers)
+    std::for_each(each.nameSpaces.begin(), each.nameSpaces.end(), add);
+  for (const mof::InstanceDeclaration& each : repository.instances())
+    add(each.nameSpace);
+  add(configuration.interop->nameSpace);
+  return names;
+}
+
+std::vector<mof::InstanceDeclaration> declarations(const Configuration& configuration,
+                                                   const ClassRepository& repository) {
+  if (!configuration.interop)
+    return {};
+  std::vector<mof::InstanceDeclaration> result = repository.instances();
+  for (const mof::InstanceDeclaration& each : result) {
+    if (each.nameSpace.empty())
+      throw MofError(each.file, each.line, "no #pragma namespace says where the instance belongs");
+  }
+  const auto own = hostInstances(*configuration.interop, nameSpacesOf(configuration, repository));
+  result.insert(result.end(), own.begin(), own.end());
+  return result;
+}
+
+OtherName otherName(const Configuration& configuration) {
+  return configuration.interop ? OtherName{configuration.interop->nameSpace, configuration.interop->otherName}
+                               : OtherName();
 }
 
 BrokerSettings brokerSettings(const Configuration& configuration, UpcallTarget& upcalls) {
@@ -88,7 +124,9 @@ struct ObjectManager::State {
       : repository(compiled(configuration.schema)),
         dispatcher(configuration.log),
         broker(repository, brokerSettings(configuration, dispatcher)),
-        routes(repository, broker, configuration.providers, configuration.providerFolder, configuration.log) {
+        declared(repository, broker.classes(), declarations(configuration, repository)),
+        routes(repository, broker, configuration.providers, configuration.providerFolder, configuration.log,
+               declared, otherName(configuration)) {
     dispatcher.setRoutes(routes);
   }
 
@@ -101,20 +139,20 @@ struct ObjectManager::State {
   [[nodiscard]] std::string_view nameSpaceMeant(std::string_view nameSpace,
                                                 std::string_view className) const {
     nameSpace = withoutSlashes(nameSpace);
-    return nameSpace.empty() ? routes.defaultNameSpace(className) : nameSpace;
+    return nameSpace.empty() ? routes.defaultNameSpace(className) : routes.properName(nameSpace);
   }
 
   /// Runs `request(path)` on the path that the text names.
   template <class Request>
   [[nodiscard]] Outcome onPath(std::string_view text, const Request& request) const {
     Arena arena;
-    const ObjectPath* path = nullptr;
+    ObjectPath* path = nullptr;
     try {
       path = parseWbemUri(arena, broker.classes(), text);
-      const std::string_view nameSpace =
-          path->nameSpace().empty() ? routes.defaultNameSpace(path->className()) : path->nameSpace();
+      const std::string_view nameSpace = nameSpaceMeant(path->nameSpace(), path->className());
       // Once more, because the namespace is also that of the references in the keys.
       path = parseWbemUri(arena, broker.classes(), text, nameSpace);
+      path->setNameSpace(nameSpace);
     } catch (const WbemUriError& error) {
       return {{CMPI_RC_ERR_INVALID_PARAMETER, error.what()}, false, 0};
     }
@@ -124,11 +162,12 @@ struct ObjectManager::State {
   /// The path with the namespace that is meant.
   template <class Request>
   [[nodiscard]] Outcome onPath(const ObjectPath& path, const Request& request) const {
-    if (!path.nameSpace().empty())
+    const std::string_view nameSpace = nameSpaceMeant(path.nameSpace(), path.className());
+    if (nameSpace == path.nameSpace())
       return request(path);
     Arena arena;
     ObjectPath* const placed = path.copyTo(arena);
-    placed->setNameSpace(routes.defaultNameSpace(path.className()));
+    placed->setNameSpace(nameSpace);
     return request(*placed);
   }
 
@@ -172,6 +211,7 @@ struct ObjectManager::State {
   ClassRepository repository;
   Dispatcher dispatcher;
   Broker broker;
+  DeclaredInstances declared;
   Routes routes;  ///< goes first: providers are unloaded while the broker is there
 };
 
@@ -286,7 +326,7 @@ Outcome ObjectManager::execQuery(std::string_view nameSpace, std::string_view la
 }
 
 std::vector<std::string> ObjectManager::nameSpaces() const {
-  return {};
+  return state_->routes.nameSpaces();
 }
 
 bool ObjectManager::knowsNameSpace(std::string_view nameSpace) const {

@@ -5,6 +5,7 @@
 // about. Threads: requests may be made from several threads at once.
 #pragma once
 
+#include <cimom/Interop.h>
 #include <cimom/Outcome.h>
 #include <cimom/ProviderRegistration.h>
 #include <cimom/broker/Objects.h>
@@ -27,6 +28,9 @@ struct Configuration {
   std::vector<ProviderRegistration> providers;  ///< which library serves which classes
   std::filesystem::path providerFolder;         ///< where libNAME.so of a registration is looked for
   std::function<void(std::string_view)> log;    ///< one line of diagnostics a call; empty: none
+  /// None: the object manager tells nothing of itself, and the instances that the schema declares are not
+  /// there.
+  std::optional<InteropSettings> interop = {};
 };
 
 /// Takes each object while it is valid: only during the call. Returning false ends the delivery, not the

@@ -50,7 +50,7 @@ Status notSupported(std::string what) {
 }
 
 std::string named(const Route& route) {
-  return "provider " + route.library->provider();
+  return route.isDeclared() ? "the schema" : "provider " + route.library->provider();
 }
 
 }  // namespace cimom

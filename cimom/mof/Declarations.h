@@ -14,7 +14,8 @@
 namespace cimom::mof {
 
 /// One value of a MOF text. `std::monostate` is NULL. Integers keep their sign: what does not fit a signed
-/// number is unsigned. A `char16` literal is a CMPIChar16; datetimes and references are texts.
+/// number is unsigned. A `char16` literal is a CMPIChar16; datetimes and references are texts, an alias that
+/// stands for a reference with its `$`.
 using Scalar =
     std::variant<std::monostate, bool, std::int64_t, std::uint64_t, double, CMPIChar16, std::string>;
 
@@ -102,6 +103,7 @@ struct QualifierDeclaration {
 
 /// `instance of C as $Alias { Name = "x"; };`
 struct InstanceDeclaration {
+  std::string nameSpace;  ///< of the last `#pragma namespace` before it in its text; empty: none
   std::string className;
   std::string alias;  ///< with its `$`; empty: none
   std::vector<std::pair<std::string, Value>> values;

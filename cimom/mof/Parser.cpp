@@ -1,6 +1,7 @@
 #include <cimom/mof/MofError.h>
 #include <cimom/mof/Parser.h>
 
+#include <algorithm>
 #include <array>
 #include <tuple>
 
@@ -102,15 +103,25 @@ bool Parser::directive(Include& include) {
   include.line = token_.line;
   advance();
   const bool isInclude = token_.isName("include");
+  const bool isNameSpace = token_.isName("namespace");
   const std::string name = expectName("the name of a directive after #pragma");
   expect('(', "after #pragma " + name);
   const auto* text = std::get_if<std::string>(&token_.value);
   if (text == nullptr)
     fail("expected a text in quotes in #pragma " + name + ", got " + token_.shown());
   include.file = *text;
+  if (isNameSpace)
+    takeNameSpace(*text);
   advance();
   expect(')', "after #pragma " + name);
   return isInclude;
+}
+
+void Parser::takeNameSpace(std::string_view text) {
+  text.remove_prefix(std::min(text.find_first_not_of('/'), text.size()));
+  if (text.empty() || text.find(':') != std::string_view::npos)
+    fail("#pragma namespace names one of this host, like \"root/interop\", got " + token_.shown());
+  nameSpace_ = text;
 }
 
 Class Parser::classDeclaration(Qualifiers qualifiers) {
@@ -232,6 +243,7 @@ std::vector<std::string> Parser::nameList(const std::string& what) {
 
 InstanceDeclaration Parser::instanceDeclaration() {
   InstanceDeclaration result;
+  result.nameSpace = nameSpace_;
   result.file = lexer_.fileName();
   result.line = token_.line;
   if (!acceptName("of"))

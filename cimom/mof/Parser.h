@@ -13,7 +13,8 @@
 
 namespace cimom::mof {
 
-/// `#pragma include ("file")`. Other directives (locale, namespace) are read and left out.
+/// `#pragma include ("file")`. Of the other directives, `namespace` counts for the instances that follow it
+/// in the same text; the rest (locale) is read and left out.
 struct Include {
   std::string file;
   int line = 0;
@@ -41,6 +42,7 @@ class Parser {
   std::string expectName(const std::string& what);
 
   bool directive(Include& include);
+  void takeNameSpace(std::string_view text);
   Class classDeclaration(Qualifiers qualifiers);
   void feature(Class& owner);
   Property property(CMPIType type, std::string reference, Qualifiers qualifiers);
@@ -60,6 +62,7 @@ class Parser {
   Token token_;       ///< the one being looked at
   int lastLine_ = 1;  ///< of the token before it
   std::string name_;  ///< of the feature being read
+  std::string nameSpace_;
 };
 
 }  // namespace cimom::mof
