@@ -3,6 +3,7 @@
 #include <cimom/Names.h>
 
 #include <dlfcn.h>
+#include <tests/support/Dsp0203.h>
 
 #include <algorithm>
 #include <stdexcept>
@@ -233,6 +234,10 @@ void Protocol::restart() {
 Recorded Protocol::send(const Request& request) const {
   Recorded answer;
   endpoint_->handle(request, answer);
+  const bool isXml = answer.field("Content-Type").find("xml") != std::string::npos;
+  if (answer.status == 200 && !answer.failed && isXml) {
+    EXPECT_EQ(dsp0203::firstViolation(answer.body), "") << answer.body;
+  }
   return answer;
 }
 

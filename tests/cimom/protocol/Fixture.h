@@ -100,8 +100,9 @@ class Protocol : public testing::Test {
   /// The endpoint is made anew with what `settings` has now.
   void restart();
 
+  /// The structure of every whole answer in XML is checked.
   Recorded send(const Request& request) const;
-  /// Sends an operation that must be answered well; the structure of the answer is checked.
+  /// Sends an operation that must be answered well.
   std::string ask(const std::string& method, const std::vector<Given>& parameters = {}) const;
   /// Sends an operation that must be answered with this error, which must have a description.
   std::string expectError(int code, const std::string& method, const std::vector<Given>& parameters = {},

@@ -57,10 +57,11 @@ class Answer {
   Answer(const CMPIResult* result, const CMPIObjectPath* asked, bool names)
       : result_(result), asked_(asked), names_(names) {}
 
-  /// False once nobody wants more.
-  bool give(const CMPIObjectPath* path, CMPIUint32 number) const {
-    if (names_)
-      return CMReturnObjectPath(result_, path).rc == CMPI_RC_OK;
+  void give(const CMPIObjectPath* path, CMPIUint32 number) const {
+    if (names_) {
+      CMReturnObjectPath(result_, path);
+      return;
+    }
     CMPIInstance* instance = CMNewInstance(broker, path, nullptr);
     CMPIValue value;
     value.uint32 = number;
@@ -68,10 +69,10 @@ class Answer {
     instance->ft->setProperty(instance, "Text", reinterpret_cast<const CMPIValue*>("a < b"), CMPI_chars);
     instance->ft->setProperty(instance, "Extra", reinterpret_cast<const CMPIValue*>("more"), CMPI_chars);
     instance->ft->setProperty(instance, "Note", reinterpret_cast<const CMPIValue*>("noted"), CMPI_chars);
-    return CMReturnInstance(result_, instance).rc == CMPI_RC_OK;
+    CMReturnInstance(result_, instance);
   }
-  bool give(const char* className, const std::string& name, CMPIUint32 number = 0) const {
-    return give(pathOf(asked_, className, name), number);
+  void give(const char* className, const std::string& name, CMPIUint32 number = 0) const {
+    give(pathOf(asked_, className, name), number);
   }
 
   [[nodiscard]] CMPIStatus done() const { return CMReturnDone(result_); }
@@ -87,17 +88,16 @@ CMPIStatus crowd(const Answer& answer) {
   std::unique_lock lock(steered.mutex);
   steered.delivered = 0;
   ++steered.running;
-  bool isWanted = true;
-  while (isWanted && steered.delivered < steered.size && steered.delivered < steered.failsAfter) {
-    steered.changed.wait(lock, [&] { return steered.delivered < steered.allowed; });
-    const std::size_t number = steered.delivered;
+  std::size_t number = 0;
+  for (; number < steered.size && number < steered.failsAfter; ++number) {
+    steered.changed.wait(lock, [&] { return number < steered.allowed; });
     lock.unlock();
-    isWanted = answer.give("TEST_Crowd", "n" + std::to_string(number), static_cast<CMPIUint32>(number));
+    answer.give("TEST_Crowd", "n" + std::to_string(number), static_cast<CMPIUint32>(number));
     lock.lock();
-    ++steered.delivered;
+    steered.delivered = number + 1;
     steered.changed.notify_all();
   }
-  const bool fails = isWanted && steered.failsAfter <= steered.delivered;
+  const bool fails = steered.failsAfter <= number;
   --steered.running;
   steered.changed.notify_all();
   return fails ? failure(CMPI_RC_ERR_ACCESS_DENIED, "no entry") : answer.done();
