@@ -95,7 +95,8 @@ class Writer {
       return;
     out_ += "<METHOD";
     appendAttribute(out_, "NAME", method.name);
-    appendAttribute(out_, "TYPE", typeName(method.type));
+    if (method.type != CMPI_null)
+      appendAttribute(out_, "TYPE", typeName(method.type));
     writeOrigin(method.origin, own == nullptr);
     out_ += '>';
     writeQualifiers(method.qualifiers, own == nullptr ? nullptr : &own->qualifiers);

@@ -26,7 +26,6 @@ constexpr auto elementNames = std::to_array<std::string_view>({
     "DECLGROUP",
     "DECLGROUP.WITHNAME",
     "DECLGROUP.WITHPATH",
-    "ENUMERATIONCONTEXT",
     "ERROR",
     "EXPMETHODCALL",
     "EXPMETHODRESPONSE",
