@@ -1,5 +1,7 @@
 #include "Machine.h"
 
+#include <agent/discovery/SystemRoot.h>
+
 #include <gtest/gtest.h>
 
 #include <cerrno>
