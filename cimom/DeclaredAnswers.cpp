@@ -41,6 +41,12 @@ bool isWithin(const DeclaredInstance& declared, const Route& route) {
   return &declared.classInfo() == route.info;
 }
 
+/// Whether a status says that there is no such object. It is in no association then; any other failure is one
+/// of the request.
+bool isUnknown(const Status& status) {
+  return status.code == CMPI_RC_ERR_NOT_FOUND || status.code == CMPI_RC_ERR_INVALID_PARAMETER;
+}
+
 /// Takes the paths of a class's instances.
 class Ends final : public ResultSink {
  public:
@@ -139,15 +145,15 @@ bool DeclaredAnswers::concern(const Route& route, const ObjectPath& source) cons
 }
 
 bool DeclaredAnswers::holds(Work& work, const NamedValue& reference, const ObjectPath& object) const {
-  if (!objectPath(reference.data)->keys().empty())
-    return true;
+  return !objectPath(reference.data)->keys().empty() || exists(work, object);
+}
+
+bool DeclaredAnswers::exists(Work& work, const ObjectPath& object) const {
   const char* nothing[] = {nullptr};
   Nobody nobody;
   const Outcome found = dispatcher_.get({object, nothing, work.asked.context}, nobody);
-  // What the provider does not know is in no association; any other failure is one of this request.
-  const bool isUnknown =
-      found.status.code == CMPI_RC_ERR_NOT_FOUND || found.status.code == CMPI_RC_ERR_INVALID_PARAMETER;
-  if (found.status.code != CMPI_RC_OK && !isUnknown)
+  // Without a provider there are no instances.
+  if (!isUnknown(found.status) && found.status.code != CMPI_RC_ERR_NOT_SUPPORTED)
     work.note(found.status);
   return found.status.code == CMPI_RC_OK;
 }
@@ -182,9 +188,9 @@ void DeclaredAnswers::giveEnd(Work& work, const ObjectPath& end) const {
     work.note(dispatcher_.enumerate(work.kind, asked, placed).status);
   } else if (work.kind == Kind::Instances) {
     const Status status = dispatcher_.get(asked, placed).status;
-    if (status.code != CMPI_RC_ERR_NOT_FOUND)
+    if (!isUnknown(status))
       work.note(status);
-  } else {
+  } else if (exists(work, end)) {
     work.scratch.reset();
     work.wantsMore = placed.path(*end.copyTo(work.scratch));
   }

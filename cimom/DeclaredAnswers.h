@@ -45,8 +45,9 @@ class DeclaredAnswers {
   [[nodiscard]] const NamedValue* near(const DeclaredInstance& declared, const ObjectPath& object,
                                        const char* role) const;
   [[nodiscard]] bool mayHold(const NamedValue& reference, const ObjectPath& object) const;
-  /// Whether a pattern's reference holds the object, which takes asking its provider.
+  /// Whether the reference, which may hold the object, does: for a pattern that takes asking its provider.
   [[nodiscard]] bool holds(Work& work, const NamedValue& reference, const ObjectPath& object) const;
+  [[nodiscard]] bool exists(Work& work, const ObjectPath& object) const;
   [[nodiscard]] bool isNamed(const DeclaredInstance& declared, const ObjectPath& path) const;
 
   void give(Work& work, const DeclaredInstance& declared) const;

@@ -1,5 +1,7 @@
+#include <cimom/mof/MofError.h>
 #include <cimom/mof/Parser.h>
 
+#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include <variant>
@@ -99,6 +101,33 @@ instance of A as $First { Name = "x"; Other = $Second; Numbers = {1, 2}; };)");
   EXPECT_EQ(instance.alias, "$First");
   ASSERT_EQ(instance.values.size(), 3U);
   EXPECT_EQ(instance.values[1].second, (Value{false, {std::string("$Second")}}));
+}
+
+TEST(MofParser, readsTheNamespaceOfInstances) {
+  Parser parser(R"(instance of A {};
+#pragma namespace ("root/interop")
+instance of B {};
+class C {};
+instance of D {};
+#pragma locale ("en_US")
+#pragma namespace ("//root/cimv2")
+instance of E {};)",
+                "text.mof");
+  EXPECT_EQ(std::get<InstanceDeclaration>(parser.next()).nameSpace, "");
+  EXPECT_EQ(std::get<InstanceDeclaration>(parser.next()).nameSpace, "root/interop");
+  EXPECT_EQ(std::get<Class>(parser.next()).name, "C");
+  EXPECT_EQ(std::get<InstanceDeclaration>(parser.next()).nameSpace, "root/interop");
+  EXPECT_EQ(std::get<InstanceDeclaration>(parser.next()).nameSpace, "root/cimv2");
+}
+
+TEST(MofParser, refusesNamespacesOfOtherHosts) {
+  for (const char* name : {"", "/", "http://other/root/cimv2"}) {
+    const std::string text = "\n#pragma namespace (\"" + std::string(name) + "\")\ninstance of A {};";
+    Parser parser(text, "text.mof");
+    EXPECT_THAT([&] { static_cast<void>(parser.next()); },
+                testing::ThrowsMessage<cimom::MofError>(
+                    testing::HasSubstr("text.mof:2: #pragma namespace names one of this host")));
+  }
 }
 
 TEST(MofParser, handsOverIncludesAndSkipsOtherDirectives) {
