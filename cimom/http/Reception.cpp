@@ -159,6 +159,11 @@ void Reception::judge(MHD_Connection* connection) {
     refuse(431, "The request's headers are too large.\n");
     return;
   }
+  // A NUL ended what MHD took for the target.
+  if (request.target.empty()) {
+    refuse(400, "The request has no target.\n");
+    return;
+  }
   // Whoever stands between client and server may count the body differently: no guess which one is meant.
   if (request.field("Content-Length") != nullptr && request.field("Transfer-Encoding") != nullptr) {
     refuse(400, "The request has both Content-Length and Transfer-Encoding.\n");
