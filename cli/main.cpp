@@ -44,13 +44,9 @@ void run(const cli::Options& options, cli::Output& output) {
     case cli::Command::Unregister:
       return cli::runUnregister(options, output);
     case cli::Command::Serve:
+      return cli::runServe(options, output);
     case cli::Command::Passwd:
-#ifdef SWINV_HAS_ENDPOINT
-      return options.command == cli::Command::Serve ? cli::runServe(options, output)
-                                                    : cli::runPasswd(options, output);
-#else
-      throw cli::CommandError("this build has no endpoint");
-#endif
+      return cli::runPasswd(options, output);
   }
 }
 

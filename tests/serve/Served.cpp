@@ -135,11 +135,6 @@ int Served::end() {
   return wait();
 }
 
-cli_test::Result wbemcli(std::vector<std::string> arguments) {
-  arguments.insert(arguments.begin(), "-nl");
-  return cli_test::run({std::move(arguments), {}, "/usr/bin/wbemcli"});
-}
-
 void pauseShortly() {
   std::this_thread::sleep_for(std::chrono::milliseconds(10));
 }

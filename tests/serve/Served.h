@@ -1,4 +1,4 @@
-// `swinv serve` as a child of the test, and Debian's wbemcli as its client.
+// `swinv serve` as a child of the test.
 #pragma once
 
 #include "../cli/Process.h"
@@ -55,16 +55,10 @@ class Served {
   std::vector<std::string> urls_;
 };
 
-/// Runs wbemcli to its end; `-nl` stands before the arguments.
-cli_test::Result wbemcli(std::vector<std::string> arguments);
-
-/// Tries until `condition` holds. False: it did not within a minute.
-template <typename Condition>
-bool eventually(const Condition& condition);
-
 /// A pause between two such tries.
 void pauseShortly();
 
+/// Tries until `condition` holds. False: it did not within a minute.
 template <typename Condition>
 bool eventually(const Condition& condition) {
   const auto end = std::chrono::steady_clock::now() + std::chrono::minutes(1);
