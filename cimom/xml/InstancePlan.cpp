@@ -70,20 +70,25 @@ class Planner {
     }
     item.nullBegin = plan_.nulls.size();
     plan_.nulls += item.open;
+    item.close = closeTag(property);
+    if (item.open.ends_with("</QUALIFIER>"))
+      plan_.nulls += item.close;
+    else
+      plan_.nulls.insert(plan_.nulls.size() - 1, "/");
+    item.nullEnd = plan_.nulls.size();
     if (property.type == CMPI_ref) {
       item.reference = std::make_unique<PathWriter>(PathForm::valueReference, options_.location);
-      item.close = "</PROPERTY.REFERENCE>";
-      plan_.nulls += item.close;
-    } else if ((property.type & CMPI_ARRAY) != 0) {
-      item.close = "</PROPERTY.ARRAY>";
-      plan_.nulls += item.close;
-    } else {
+    } else if ((property.type & CMPI_ARRAY) == 0) {
       item.open += "<VALUE>";
       item.close = "</VALUE></PROPERTY>";
-      plan_.nulls += "</PROPERTY>";
     }
-    item.nullEnd = plan_.nulls.size();
     plan_.properties.push_back(std::move(item));
+  }
+
+  static std::string_view closeTag(const PropertyInfo& property) {
+    if (property.type == CMPI_ref)
+      return "</PROPERTY.REFERENCE>";
+    return (property.type & CMPI_ARRAY) != 0 ? "</PROPERTY.ARRAY>" : "</PROPERTY>";
   }
 
   [[nodiscard]] std::string openTag(const PropertyInfo& property, const mof::Property* declared) const {
