@@ -111,7 +111,9 @@ void Exchange::addFields(MHD_Response* response, bool closes) {
     if (isServersOwn(field) || (!trailersGo && isNamed(field, "Trailer"))) {
       continue;
     }
-    if (MHD_add_response_header(response, field.name.c_str(), field.value.c_str()) != MHD_YES) {
+    // MHD refuses an empty value. The blank is none either: it belongs to no value (RFC 9112).
+    const char* value = field.value.empty() ? " " : field.value.c_str();
+    if (MHD_add_response_header(response, field.name.c_str(), value) != MHD_YES) {
       parts_.log(LogLevel::error, "a header of an answer was left out: HTTP cannot carry its value");
     }
   }

@@ -16,7 +16,7 @@ class Answers : public testing::Test {
 
 TEST_F(Answers, ShortAnswerHasItsLength) {
   Server server(settings_, [](const Request&, Answer& answer) {
-    beginText(answer, {{"X-Own", "yes"}});
+    beginText(answer, {{"X-Own", "yes"}, {"Ext", ""}});
     answer.write("one, ");
     answer.write("two");
   });
@@ -26,6 +26,7 @@ TEST_F(Answers, ShortAnswerHasItsLength) {
   EXPECT_EQ(answer.version, "HTTP/1.1");
   EXPECT_EQ(answer.field("Content-Length"), "8");
   EXPECT_EQ(answer.field("X-Own"), "yes");
+  EXPECT_EQ(answer.field("Ext"), "");  // there, and empty
   EXPECT_EQ(answer.body, "one, two");
   EXPECT_TRUE(answer.isComplete);
 }
