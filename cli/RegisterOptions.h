@@ -3,7 +3,7 @@
 
 #include <string>
 
-namespace CLI {
+namespace CLI {  // NOLINT(readability-identifier-naming): that library's own name
 class App;
 }
 

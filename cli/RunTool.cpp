@@ -66,7 +66,7 @@ std::string findProgram(const std::string& name) {
   while (!folders.empty()) {
     const std::size_t end = std::min(folders.find(':'), folders.size());
     const std::string_view folder = folders.substr(0, end);
-    const std::string file = (folder.empty() ? std::string(".") : std::string(folder)) + "/" + name;
+    std::string file = (folder.empty() ? std::string(".") : std::string(folder)) + "/" + name;
     if (isProgram(file)) {
       return file;
     }

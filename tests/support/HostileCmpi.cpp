@@ -24,6 +24,12 @@ Answer good(CMPIStatus* status, Answer answer) {
   return answer;
 }
 
+/// As object managers mark what is read from a path.
+CMPIData asKey(CMPIData data) {
+  data.state = static_cast<CMPIValueState>(data.state | CMPI_keyValue);
+  return data;
+}
+
 bool isCalled(const std::string& name, const std::string& other) {
   return strcasecmp(name.c_str(), other.c_str()) == 0;
 }
@@ -97,7 +103,12 @@ void HostileCmpi::fillHostileTables() {
       return CMPIData{CMPI_null, CMPI_notFound, {}};
     }
     *name = object->owner->string(key->name.c_str());
-    return good(status, key->data);
+    return good(status, asKey(key->data));
+  };
+  pathTable.getKey = [](const CMPIObjectPath* path, const char* name, CMPIStatus* status) {
+    auto* object = of<PathObject>(path);
+    auto* host = static_cast<HostileCmpi*>(object->owner);
+    return asKey(host->find("getKey", object->keys, name, status));
   };
   factory.newInstance = [](const CMPIBroker* broker, const CMPIObjectPath* path, CMPIStatus* status) {
     auto* host = static_cast<HostileCmpi*>(of<FakeCmpi>(broker));

@@ -239,11 +239,12 @@ Answer Host::names(const CMPIObjectPath* source, const char* associationClass) c
   });
 }
 
-Answer Host::associators(const CMPIObjectPath* source, const char* associationClass) const {
+Answer Host::associators(const CMPIObjectPath* source, const char* associationClass,
+                         const Narrowing& narrowing) const {
   CMPIAssociationMI* mi = associations.at(associationClass);
   return answerOf([&](const CMPIResult* result) {
-    return mi->ft->associators(mi, nullptr, result, source, associationClass, nullptr, nullptr, nullptr,
-                               nullptr);
+    return mi->ft->associators(mi, nullptr, result, source, associationClass, narrowing.resultClass,
+                               narrowing.role, narrowing.resultRole, nullptr);
   });
 }
 

@@ -44,6 +44,14 @@ struct Answer {
   [[nodiscard]] std::vector<std::string> paths() const;
 };
 
+/// What narrows an association request, apart from the association's class. Object managers may leave it to
+/// the provider to heed it.
+struct Narrowing {
+  const char* resultClass = nullptr;
+  const char* role = nullptr;
+  const char* resultRole = nullptr;
+};
+
 class Host {
  public:
   /// How a null that is handed to a result is answered.
@@ -58,7 +66,8 @@ class Host {
   Answer enumerate(const CMPIObjectPath* path, const char** properties = nullptr) const;
   Answer get(const CMPIObjectPath* path) const;
   Answer names(const CMPIObjectPath* source, const char* associationClass) const;
-  Answer associators(const CMPIObjectPath* source, const char* associationClass) const;
+  Answer associators(const CMPIObjectPath* source, const char* associationClass,
+                     const Narrowing& narrowing = {}) const;
 
   /// Answers upcalls of `cmpi` with the provider of the class that is asked for: with the path as it is, or
   /// with one whose keys got lost on the way.

@@ -161,4 +161,17 @@ TEST_F(HostKeys, NeedNoSuperclass) {
   }
 }
 
+// Result class and roles are the object manager's to heed: the provider answers the same whatever they say.
+TEST_F(HostKeys, AreAllThatNarrowsAnAssociation) {
+  for (const char* association : associationClasses) {
+    const std::vector<std::string> all = providers.associators(softwareOf("26@f3"), association).paths();
+    for (const host::Narrowing& narrowing :
+         {host::Narrowing{host::software, nullptr, nullptr},
+          host::Narrowing{"CIM_Chassis", "None", "Neither"}, host::Narrowing{"", "", ""}}) {
+      EXPECT_EQ(providers.associators(softwareOf("26@f3"), association, narrowing).paths(), all)
+          << association;
+    }
+  }
+}
+
 }  // namespace
