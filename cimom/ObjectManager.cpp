@@ -26,7 +26,9 @@ ClassRepository compiled(const std::vector<std::filesystem::path>& schema) {
 /// The namespaces of registrations and declarations, and then the interop one.
 std::vector<std::string> nameSpacesOf(const Configuration& configuration, const ClassRepository& repository) {
   std::vector<std::string> names;
-  const auto add = [&](const std::string& name) {
+  const InteropSettings& interop = *configuration.interop;
+  const auto add = [&](const std::string& given) {
+    const std::string& name = sameName(given, interop.otherName) ? interop.nameSpace : given;
     if (std::none_of(names.begin(), names.end(), [&](const auto& known) { return sameName(known, name); }))
       names.push_back(name);
   };
@@ -34,7 +36,7 @@ std::vector<std::string> nameSpacesOf(const Configuration& configuration, const 
     std::for_each(each.nameSpaces.begin(), each.nameSpaces.end(), add);
   for (const mof::InstanceDeclaration& each : repository.instances())
     add(each.nameSpace);
-  add(configuration.interop->nameSpace);
+  add(interop.nameSpace);
   return names;
 }
 

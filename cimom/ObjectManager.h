@@ -2,7 +2,8 @@
 // them.
 //
 // It knows classes and providers only from what it is configured with, and nothing of what any provider is
-// about. Threads: requests may be made from several threads at once.
+// about. Instances that the schema declares it serves itself, each in its namespace, as a provider would.
+// Threads: requests may be made from several threads at once.
 #pragma once
 
 #include <cimom/Interop.h>
@@ -51,10 +52,11 @@ struct AssociationQuery {
 
 class ObjectManager {
  public:
-  /// Reads the schema. Throws `MofError` (file, line, what was expected), or `std::runtime_error` where a
-  /// registered class is not in the schema or is registered twice in a namespace. Providers are loaded when a
-  /// request first needs them; `tzset` is called once before. They are cleaned up and unloaded with the
-  /// object manager, when no request may be under way.
+  /// Reads the schema. Throws `MofError` (file, line, what was expected), also for a declared instance that
+  /// cannot be one, or `std::runtime_error` where a registered class is not in the schema, is registered
+  /// twice in a namespace or has declared instances there. Providers are loaded when a request first needs
+  /// them; `tzset` is called once before. They are cleaned up and unloaded with the object manager, when no
+  /// request may be under way.
   explicit ObjectManager(const Configuration& configuration);
   ~ObjectManager();
   ObjectManager(const ObjectManager&) = delete;
@@ -104,6 +106,10 @@ class ObjectManager {
   /// it delivered nothing. Until then, and for a class that stands in no reference of that path, the
   /// declaration counts. Where one class stands at both ends it cannot tell them apart: that is left to the
   /// provider, which is given the roles and the result class too.
+  ///
+  /// An association that is declared in one namespace and refers to objects of another is found from both;
+  /// its own path, and what stands at its ends, name their namespaces. One that is declared with a class in
+  /// the place of an object ends on each instance that the class's provider has at the time.
   ///
   /// CMPI_RC_ERR_INVALID_PARAMETER for a source whose text is no path, whose class the schema lacks or whose
   /// keys do not fit it, an association class that the schema lacks or that is no association, and a result

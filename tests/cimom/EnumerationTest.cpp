@@ -98,6 +98,11 @@ TEST_F(Enumeration, saysThatTheDoneMarkerIsMissing) {
   EXPECT_THAT(answer.objects, ElementsAre("TEST_NoDone first 1"));
   EXPECT_THAT(log_.all(),
               ElementsAre(HasSubstr("provider TestProvider stopped early: for class TEST_NoDone")));
+  EXPECT_EQ(manager_.unfinishedAnswers(), 1U);
+  instances("TEST_NoDone");
+  instances("TEST_Thing");
+  instances("TEST_Failing");
+  EXPECT_EQ(manager_.unfinishedAnswers(), 2U);
 }
 
 TEST_F(Enumeration, leavesNullsOut) {

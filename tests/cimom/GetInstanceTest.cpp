@@ -72,6 +72,7 @@ TEST_F(GetInstance, passesOnAnAnswerWithoutADoneMarker) {
   EXPECT_FALSE(answer.outcome.done);
   EXPECT_THAT(answer.objects, ElementsAre("TEST_Thing no done 1"));
   EXPECT_THAT(log_.all(), ElementsAre(HasSubstr("no done marker")));
+  EXPECT_EQ(manager_.unfinishedAnswers(), 1U);
 }
 
 TEST_F(GetInstance, passesOnAFailure) {

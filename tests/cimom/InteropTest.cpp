@@ -3,6 +3,8 @@
 #include <unistd.h>
 
 #include <array>
+#include <atomic>
+#include <thread>
 
 namespace {
 
@@ -159,6 +161,33 @@ TEST_F(Interop, classesHaveProvidersOrDeclaredInstances) {
                  "a provider is registered for class CIM_Namespace in root/interop, where "
                  "instances of it are declared");
   }
+}
+
+// A registration may call the namespace by either name.
+TEST_F(Interop, isOneNamespace) {
+  Lines log;
+  cimom::Configuration configuration = declaredConfiguration(log);
+  configuration.providers.front().nameSpaces = {"interop", "root/test"};
+  cimom::ObjectManager manager(configuration);
+  const std::vector<std::string> all = {"root/interop", "root/test", "root/about"};
+  EXPECT_EQ(manager.nameSpaces(), all);
+  EXPECT_EQ(values(manager, "interop", "CIM_Namespace", "Name"), all);
+  EXPECT_THAT(values(manager, "root/interop", "TEST_Plain3", "Name"),
+              ElementsAre("object 0", "object 1", "object 2"));
+}
+
+TEST_F(Interop, answersSeveralThreads) {
+  std::atomic<int> answers{0};
+  const auto ask = [&] {
+    for (int round = 0; round < 20; ++round) {
+      answers += static_cast<int>(instances("root/about", "TEST_Conforms").objects.size());
+      answers += static_cast<int>(instances("interop", "CIM_Namespace").objects.size());
+    }
+  };
+  std::thread other(ask);
+  ask();
+  other.join();
+  EXPECT_EQ(answers, 2 * 20 * (4 + 3));
 }
 
 TEST_F(Interop, instancesNeedANamespace) {
