@@ -1,5 +1,7 @@
 #include <cimom/http/Connections.h>
+
 #include <sys/socket.h>
+#include <algorithm>
 
 namespace cimom::http {
 
@@ -42,11 +44,18 @@ void Connections::leave(int descriptor) {
   connections_.erase(found);
 }
 
+void Connections::awaitNoneAfter(Clock::time_point last) {
+  const std::lock_guard lock(mutex_);
+  last_ = last;
+}
+
 std::vector<std::string> Connections::cutLate(Clock::time_point now) {
   std::vector<std::string> cut;
   const std::lock_guard lock(mutex_);
   for (auto& [descriptor, connection] : connections_) {
-    if (connection.due.load() < now) {
+    const Clock::time_point due = connection.due;
+    const bool isAwaited = due != Clock::time_point::max();
+    if (isAwaited && std::min(due, last_) < now) {
       connection.due = Clock::time_point::max();
       ::shutdown(descriptor, SHUT_RDWR);
       cut.push_back(connection.peer);

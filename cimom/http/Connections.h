@@ -35,6 +35,9 @@ class Connections {
   [[nodiscard]] Connection* find(int descriptor);
   void leave(int descriptor);
 
+  /// Requests that have not arrived whole by then are late, whatever their time: the server is about to end.
+  void awaitNoneAfter(Clock::time_point last);
+
   /// Shuts those down that have taken too long to send a request; returns their peers.
   std::vector<std::string> cutLate(Clock::time_point now);
 
@@ -42,6 +45,7 @@ class Connections {
   const Bounds& bounds_;
   std::mutex mutex_;
   std::map<int, Connection> connections_;
+  Clock::time_point last_ = Clock::time_point::max();
   std::unordered_map<std::string, std::size_t> origins_;
 };
 

@@ -144,6 +144,9 @@ void Desk::check(const std::shared_ptr<Exchange>& exchange, const BasicLogin& lo
 }
 
 void Desk::handle(Exchange& exchange) {
+  if (exchange.isCut()) {
+    return;
+  }
   try {
     handler_(exchange.request, exchange);
     exchange.finish();

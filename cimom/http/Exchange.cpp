@@ -176,6 +176,11 @@ void Exchange::cut() {
   cutLocked();
 }
 
+bool Exchange::isCut() const {
+  const std::lock_guard lock(mutex_);
+  return cut_;
+}
+
 void Exchange::cutLocked() {
   if (cut_) {
     return;

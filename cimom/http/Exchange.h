@@ -62,6 +62,7 @@ class Exchange : public Answer, public std::enable_shared_from_this<Exchange> {
   void flush();
   /// Nothing more will reach the client; the connection ends.
   void cut();
+  [[nodiscard]] bool isCut() const;
   /// Cuts it if the client has taken nothing for the stall time. True: it did.
   bool cutIfStalled(Clock::time_point now);
 

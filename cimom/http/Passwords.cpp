@@ -70,6 +70,15 @@ std::string hashPassword(std::string_view password) {
   return *hash;
 }
 
+namespace {
+
+const std::string& nobodysHash() {
+  static const std::string hash = hashPassword("nobody");
+  return hash;
+}
+
+}  // namespace
+
 Passwords Passwords::parse(std::string_view text, std::string_view origin) {
   const auto refuse = [&](std::size_t line, const std::string& why) {
     throw PasswordError(std::string(origin) + ":" + std::to_string(line) + ": " + why);
@@ -98,7 +107,7 @@ Passwords Passwords::parse(std::string_view text, std::string_view origin) {
     }
   }
   // Hashing for an unknown user costs what it costs for a known one.
-  passwords.nobody_ = passwords.hashes_.empty() ? hashPassword("nobody") : passwords.hashes_.begin()->second;
+  passwords.nobody_ = passwords.hashes_.empty() ? nobodysHash() : passwords.hashes_.begin()->second;
   return passwords;
 }
 

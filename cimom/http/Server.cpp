@@ -12,6 +12,8 @@ namespace {
 
 constexpr std::chrono::milliseconds shortestSweep{10};
 constexpr std::chrono::milliseconds longestSweep{1000};
+/// How long the rest of a request may take to arrive once the server is to stop.
+constexpr std::chrono::milliseconds arrivalAtTheEnd{1000};
 
 bool hasTls(const Settings& settings) {
   return std::any_of(settings.listeners.begin(), settings.listeners.end(),
@@ -201,6 +203,7 @@ bool Server::Core::stop(std::chrono::milliseconds patience) {
   ended_ = true;
   acceptor_.reset();
   desk_.closeSoon();
+  connections_.awaitNoneAfter(Clock::now() + arrivalAtTheEnd);
   const bool finished = desk_.waitForNone(patience);
   if (!finished) {
     desk_.log(LogLevel::warning,

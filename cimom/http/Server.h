@@ -41,7 +41,10 @@ class Answer {
   virtual ~Answer() = default;
 
   /// The status line and headers, once, before everything else. Nothing goes out yet: the headers leave with
-  /// the first bytes of the body, or when the handler has returned.
+  /// the first bytes of the body, or when the handler has returned. Content-Length, Transfer-Encoding,
+  /// Connection and Date are the server's own and left out here; a Trailer field names what `fail` may send,
+  /// and goes out only where trailers can. Called twice without a `fail` that took the first back, it throws
+  /// std::logic_error.
   virtual void begin(int status, std::vector<Field> fields) = 0;
 
   /// More of the body; pieces of some kilobytes are best. Blocks while the client is slower than the handler

@@ -12,9 +12,11 @@ constexpr std::chrono::seconds idleThreadStays{10};
 }  // namespace
 
 void Workers::submit(Task task) {
-  const std::lock_guard lock(mutex_);
+  std::unique_lock lock(mutex_);
   tasks_.push_back(std::move(task));
   if (idle_ >= tasks_.size()) {
+    // Woken with the mutex held, the worker would go back to sleep at once.
+    lock.unlock();
     work_.notify_one();
     return;
   }

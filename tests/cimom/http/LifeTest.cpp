@@ -168,7 +168,7 @@ TEST_F(Life, StopCutsWhatTakesTooLong) {
 TEST_F(Life, DestructorEndsWhatIsThere) {
   Signal arrived;
   Signal go;
-  std::atomic<bool> ended = false;
+  std::atomic<int> ended = 0;
   std::vector<HttpConnection> clients;
   {
     settings_.bounds.workers = 1;
@@ -177,7 +177,7 @@ TEST_F(Life, DestructorEndsWhatIsThere) {
       EXPECT_TRUE(go.wait());
       beginText(answer);
       answer.write("late");
-      ended = true;
+      ++ended;
     });
     // One is handled, one waits for a worker, one is half sent.
     for (int next = 0; next < 2; ++next) {
@@ -185,12 +185,13 @@ TEST_F(Life, DestructorEndsWhatIsThere) {
     }
     clients.emplace_back(server.port()).send("GET / HT");
     ASSERT_TRUE(arrived.wait());
+    ASSERT_TRUE(eventually([&] { return server.requestsUnderWay() == 2; }));
     std::thread([&go] {
       std::this_thread::sleep_for(std::chrono::milliseconds(50));
       go.set();
     }).detach();
   }
-  EXPECT_TRUE(ended);
+  EXPECT_EQ(ended, 1) << "what nobody waits for any more is not begun";
   for (HttpConnection& client : clients) {
     EXPECT_TRUE(client.isClosed());
   }
