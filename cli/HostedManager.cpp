@@ -80,6 +80,10 @@ cimom::Configuration configure(const Options& options) {
                        layout.schema.string() +
                        " names a class\nThe files belong to swinv; install or build swinv again.");
   }
+  if (options.command == Command::Serve) {
+    configuration.interop.emplace();  // who comes over the network has nothing else to start from
+    configuration.interop->elementName = "swinv";
+  }
   if (options.provider) {
     applyProvider(*options.provider, configuration);
   }

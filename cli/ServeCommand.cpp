@@ -10,9 +10,13 @@
 #include <cli/ServiceManager.h>
 #include <cli/Source.h>
 
+#include <cerrno>
 #include <chrono>
 #include <memory>
+#include <stdexcept>
 #include <string>
+#include <system_error>
+#include <utility>
 #include <vector>
 
 #include <dlfcn.h>
@@ -37,6 +41,18 @@ void lookAtMachineAnew() {
     look();
   }
   dlclose(library);
+}
+
+std::unique_ptr<cimom::http::Server> startServer(const cimom::http::Settings& settings,
+                                                 cimom::http::Handler handler) {
+  try {
+    return std::make_unique<cimom::http::Server>(settings, std::move(handler));
+  } catch (const std::runtime_error& error) {
+    const std::string message = error.what();
+    const bool isInUse = message.find(std::generic_category().message(EADDRINUSE)) != std::string::npos;
+    throw CommandError(message +
+                       (isInUse ? "\nAnother server listens there; --listen takes another port." : ""));
+  }
 }
 
 std::string urls(const cimom::http::Server& server, const cimom::http::Settings& settings) {
@@ -83,16 +99,16 @@ void runServe(const Options& options, Output& output) {
   cimom::protocol::EndpointSettings endpointSettings;
   endpointSettings.log = [&log](std::string_view line) { log.write(ServerLevel::warning, line); };
   cimom::protocol::Endpoint endpoint(*manager, endpointSettings);
-  cimom::http::Server server(
+  const std::unique_ptr<cimom::http::Server> server = startServer(
       settings, [&endpoint](const auto& request, auto& answer) { endpoint.handle(request, answer); });
-  output.write(urls(server, settings));
+  output.write(urls(*server, settings));
   output.flush();
   notifyServiceManager("READY=1");
   while (signals.next() == ServeSignal::Reload) {
-    reload(server, log);
+    reload(*server, log);
   }
   signals.stopAtOnceFromNow();
-  stop(server, endpoint, log);
+  stop(*server, endpoint, log);
 }
 
 }  // namespace cli

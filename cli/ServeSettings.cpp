@@ -31,6 +31,34 @@ cimom::http::Listener listenerOn(const InheritedSocket& socket, bool hasCertific
   return listener;
 }
 
+bool isLoopback(const std::string& address) {
+  return address.starts_with("127.") || address == "::1";
+}
+
+/// The server would refuse this too; it does not know what the options are called.
+void checkSafety(const ServeOptions& options) {
+  const bool hasCertificate = options.certificate.has_value();
+  for (const ListenAddress& listen : options.listen) {
+    if (isLoopback(listen.address)) {
+      continue;
+    }
+    const std::string refusal =
+        "will not listen at " + listen.address + ", which other machines may reach, without ";
+    if (!listen.tls.value_or(hasCertificate)) {
+      throw CommandError(refusal + "TLS" +
+                         (hasCertificate
+                              ? "\nLeave out http:// there."
+                              : "\nGive --tls-certificate and --tls-key, and a login: --passwords or "
+                                "--client-ca; or listen at 127.0.0.1."));
+    }
+    if (!options.passwords && !options.clientCa) {
+      throw CommandError(refusal +
+                         "a login\nGive --passwords with a file that 'swinv passwd' made, or --client-ca; or "
+                         "listen at 127.0.0.1.");
+    }
+  }
+}
+
 std::string nameOf(const std::optional<std::filesystem::path>& file) {
   return file ? file->string() : std::string();
 }
@@ -40,6 +68,7 @@ std::string nameOf(const std::optional<std::filesystem::path>& file) {
 cimom::http::Settings serverSettings(const ServeOptions& options,
                                      const std::vector<InheritedSocket>& inherited, const ServeLog& log) {
   const bool hasCertificate = options.certificate.has_value();
+  checkSafety(options);
   cimom::http::Settings settings;
   for (const InheritedSocket& socket : inherited) {
     settings.listeners.push_back(listenerOn(socket, hasCertificate));
