@@ -69,12 +69,9 @@ class Planner {
                        false);
     }
     item.nullBegin = plan_.nulls.size();
-    plan_.nulls += item.open;
+    // With an end tag of its own: Debian's wbemcli does not read "<PROPERTY .../>".
     item.close = closeTag(property);
-    if (item.open.ends_with("</QUALIFIER>"))
-      plan_.nulls += item.close;
-    else
-      plan_.nulls.insert(plan_.nulls.size() - 1, "/");
+    plan_.nulls.append(item.open).append(item.close);
     item.nullEnd = plan_.nulls.size();
     if (property.type == CMPI_ref) {
       item.reference = std::make_unique<PathWriter>(PathForm::valueReference, options_.location);

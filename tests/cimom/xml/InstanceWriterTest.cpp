@@ -28,9 +28,9 @@ class Instances : public XmlTest {
 
 TEST_F(Instances, WhatIsNotSetIsNull) {
   EXPECT_EQ(written(make("Base")),
-            "<INSTANCE CLASSNAME=\"Base\"><PROPERTY NAME=\"Name\" TYPE=\"string\"/>"
-            "<PROPERTY NAME=\"State\" TYPE=\"uint16\"/>"
-            "<PROPERTY NAME=\"Caption\" TYPE=\"string\"/></INSTANCE>");
+            "<INSTANCE CLASSNAME=\"Base\"><PROPERTY NAME=\"Name\" TYPE=\"string\"></PROPERTY>"
+            "<PROPERTY NAME=\"State\" TYPE=\"uint16\"></PROPERTY>"
+            "<PROPERTY NAME=\"Caption\" TYPE=\"string\"></PROPERTY></INSTANCE>");
 }
 
 TEST_F(Instances, ValuesBetweenNulls) {
@@ -39,9 +39,9 @@ TEST_F(Instances, ValuesBetweenNulls) {
   value.uint16 = 7;
   set(base, "State", value, CMPI_uint16);
   EXPECT_EQ(written(base),
-            "<INSTANCE CLASSNAME=\"Base\"><PROPERTY NAME=\"Name\" TYPE=\"string\"/>"
+            "<INSTANCE CLASSNAME=\"Base\"><PROPERTY NAME=\"Name\" TYPE=\"string\"></PROPERTY>"
             "<PROPERTY NAME=\"State\" TYPE=\"uint16\"><VALUE>7</VALUE></PROPERTY>"
-            "<PROPERTY NAME=\"Caption\" TYPE=\"string\"/></INSTANCE>");
+            "<PROPERTY NAME=\"Caption\" TYPE=\"string\"></PROPERTY></INSTANCE>");
 }
 
 TEST_F(Instances, EachPropertyAloneAndEachPropertyMissing) {
@@ -60,7 +60,7 @@ TEST_F(Instances, EachPropertyAloneAndEachPropertyMissing) {
 TEST_F(Instances, ExplicitNullIsNull) {
   Instance& base = make("Base");
   ASSERT_EQ(base.setProperty("Caption", nullptr, CMPI_string), CMPI_RC_OK);
-  EXPECT_THAT(written(base), HasSubstr("<PROPERTY NAME=\"Caption\" TYPE=\"string\"/>"));
+  EXPECT_THAT(written(base), HasSubstr("<PROPERTY NAME=\"Caption\" TYPE=\"string\"></PROPERTY>"));
 }
 
 TEST_F(Instances, ArraysAndTheirNulls) {
@@ -76,7 +76,7 @@ TEST_F(Instances, ArraysAndTheirNulls) {
   EXPECT_THAT(out,
               HasSubstr("<PROPERTY.ARRAY NAME=\"Words\" TYPE=\"string\"><VALUE.ARRAY><VALUE>a&amp;b</VALUE>"
                         "<VALUE.NULL/></VALUE.ARRAY></PROPERTY.ARRAY>"));
-  EXPECT_THAT(out, HasSubstr("<PROPERTY.ARRAY NAME=\"Bytes\" TYPE=\"uint8\"/>"));
+  EXPECT_THAT(out, HasSubstr("<PROPERTY.ARRAY NAME=\"Bytes\" TYPE=\"uint8\"></PROPERTY.ARRAY>"));
 }
 
 TEST_F(Instances, EmbeddedObjectsAreMarked) {
@@ -87,7 +87,9 @@ TEST_F(Instances, EmbeddedObjectsAreMarked) {
       out,
       HasSubstr("<PROPERTY NAME=\"Inner\" TYPE=\"string\" EmbeddedObject=\"instance\"><VALUE>&lt;INSTANCE "
                 "CLASSNAME=&quot;Base&quot;/&gt;</VALUE></PROPERTY>"));
-  EXPECT_THAT(out, HasSubstr("<PROPERTY.ARRAY NAME=\"Any\" TYPE=\"string\" EmbeddedObject=\"object\"/>"));
+  EXPECT_THAT(
+      out,
+      HasSubstr("<PROPERTY.ARRAY NAME=\"Any\" TYPE=\"string\" EmbeddedObject=\"object\"></PROPERTY.ARRAY>"));
 }
 
 TEST_F(Instances, References) {
@@ -100,7 +102,8 @@ TEST_F(Instances, References) {
   const std::string out = written(tie);
   EXPECT_THAT(out, HasSubstr("<PROPERTY.REFERENCE NAME=\"Left\" REFERENCECLASS=\"Base\"><VALUE.REFERENCE>"
                              "<LOCALINSTANCEPATH>"));
-  EXPECT_THAT(out, HasSubstr("<PROPERTY.REFERENCE NAME=\"Right\" REFERENCECLASS=\"Base\"/>"));
+  EXPECT_THAT(out,
+              HasSubstr("<PROPERTY.REFERENCE NAME=\"Right\" REFERENCECLASS=\"Base\"></PROPERTY.REFERENCE>"));
 }
 
 TEST_F(Instances, TextThatXmlCannotCarryNeverBreaksTheDocument) {
@@ -183,10 +186,10 @@ TEST_F(Instances, Qualifiers) {
 TEST_F(Instances, QualifiersOfNulls) {
   InstanceOptions options;
   options.includeQualifiers = true;
-  EXPECT_THAT(
-      written(make("Base"), options),
-      HasSubstr("<VALUE>how it is</VALUE></QUALIFIER></PROPERTY><PROPERTY NAME=\"Caption\" TYPE=\"string\"/>"
-                "</INSTANCE>"));
+  EXPECT_THAT(written(make("Base"), options),
+              HasSubstr("<VALUE>how it is</VALUE></QUALIFIER></PROPERTY><PROPERTY NAME=\"Caption\" "
+                        "TYPE=\"string\"></PROPERTY>"
+                        "</INSTANCE>"));
 }
 
 TEST_F(Instances, OneWriterForInstancesOfManyClasses) {
