@@ -107,27 +107,27 @@ Source associatedPaths(const Call& call, xml::PathForm form, AskPaths ask, const
 }  // namespace
 
 Source associatorsOf(Call& call, xml::InstanceForm form) {
-  return startOf(call).isInstance
-             ? associatedInstances(call, form, &ObjectManager::associators, associatorQuery(call))
-             : associatedClasses(call, associatorClasses, associatorQuery(call));
+  if (startOf(call).isInstance)
+    return associatedInstances(call, form, &ObjectManager::associators, associatorQuery(call));
+  return associatedClasses(call, associatorClasses, associatorQuery(call));
 }
 
 Source associatorNamesOf(Call& call, xml::PathForm form) {
-  return startOf(call).isInstance
-             ? associatedPaths(call, form, &ObjectManager::associatorNames, associatorQuery(call))
-             : associatedClassPaths(call, associatorClasses, associatorQuery(call));
+  if (startOf(call).isInstance)
+    return associatedPaths(call, form, &ObjectManager::associatorNames, associatorQuery(call));
+  return associatedClassPaths(call, associatorClasses, associatorQuery(call));
 }
 
 Source referencesTo(Call& call, xml::InstanceForm form) {
-  return startOf(call).isInstance
-             ? associatedInstances(call, form, &ObjectManager::references, referenceQuery(call))
-             : associatedClasses(call, referenceClasses, referenceQuery(call));
+  if (startOf(call).isInstance)
+    return associatedInstances(call, form, &ObjectManager::references, referenceQuery(call));
+  return associatedClasses(call, referenceClasses, referenceQuery(call));
 }
 
 Source referenceNamesTo(Call& call, xml::PathForm form) {
-  return startOf(call).isInstance
-             ? associatedPaths(call, form, &ObjectManager::referenceNames, referenceQuery(call))
-             : associatedClassPaths(call, referenceClasses, referenceQuery(call));
+  if (startOf(call).isInstance)
+    return associatedPaths(call, form, &ObjectManager::referenceNames, referenceQuery(call));
+  return associatedClassPaths(call, referenceClasses, referenceQuery(call));
 }
 
 }  // namespace cimom::protocol
