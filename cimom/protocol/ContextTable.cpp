@@ -7,7 +7,6 @@
 
 #include <algorithm>
 #include <array>
-#include <cerrno>
 #include <iterator>
 #include <system_error>
 #include <utility>
@@ -23,7 +22,7 @@ constexpr std::chrono::seconds tidyInterval{1};
 std::string newContext() {
   std::array<unsigned char, 16> bytes{};
   if (getrandom(bytes.data(), bytes.size(), 0) != static_cast<ssize_t>(bytes.size()))
-    throw std::system_error(errno, std::generic_category(), "no random bytes");
+    throw CimError(CMPI_RC_ERR_FAILED, "the system has no random bytes for an enumeration's context");
   constexpr std::string_view digits = "0123456789abcdef";
   std::string text;
   for (const unsigned char byte : bytes) {
@@ -98,7 +97,9 @@ ContextTable::Lease ContextTable::open(Owner owner, Pulled pulled, std::chrono::
   // Providers that do not come to their end count too, or there would be no bound on their threads.
   if (entries_.size() >= settings_.contexts || entries_.size() + ending_.size() >= 2 * settings_.contexts)
     throw CimError(serverLimitsExceeded, "there are " + std::to_string(entries_.size()) +
-                                             " open enumerations; close one, or try again later");
+                                             " open enumerations, and " + std::to_string(ending_.size()) +
+                                             " that end; close one, or try again later");
+  std::string context = newContext();
   auto enumeration =
       std::make_shared<OpenEnumeration>(std::move(owner), pulled, idleTime, settings_.waitingObjects);
   try {
@@ -106,7 +107,6 @@ ContextTable::Lease ContextTable::open(Owner owner, Pulled pulled, std::chrono::
   } catch (const std::system_error& error) {
     throw CimError(serverLimitsExceeded, std::string("no thread for the enumeration: ") + error.what());
   }
-  std::string context = newContext();
   entries_.emplace(context, Entry{enumeration, settings_.now(), true});
   changed_.notify_all();
   return {*this, std::move(context), std::move(enumeration)};
