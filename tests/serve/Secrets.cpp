@@ -30,9 +30,9 @@ std::vector<std::string> Secrets::options() const {
           "--passwords",       file("passwords").string()};
 }
 
-void Secrets::renewCertificate(const std::string& commonName) const {
-  const tests::Certificate certificate =
-      tests::makeCertificate(commonName, tests::CertificateUse::server, &authority_);
+void Secrets::renewCertificate(const std::string& commonName, const tests::Certificate* authority) const {
+  const tests::Certificate certificate = tests::makeCertificate(
+      commonName, tests::CertificateUse::server, authority == nullptr ? &authority_ : authority);
   write(file("cert.pem"), certificate.certificate);
   write(file("key.pem"), certificate.key);
 }

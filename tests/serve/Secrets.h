@@ -21,8 +21,8 @@ class Secrets {
   /// The options of a server with TLS and passwords, at any free port.
   [[nodiscard]] std::vector<std::string> options() const;
 
-  /// Writes another certificate of the same authority over the server's.
-  void renewCertificate(const std::string& commonName) const;
+  /// Writes a new certificate over the server's, of the same authority or of another one.
+  void renewCertificate(const std::string& commonName, const tests::Certificate* authority = nullptr) const;
 
   /// Runs swinv passwd for the user of a server.
   static cli_test::Result setPassword(const std::filesystem::path& file, const std::string& user,
