@@ -100,7 +100,7 @@ void HostileCmpi::fillHostileTables() {
     const Entry* key = keyAt(*object, index);
     if (key == nullptr) {
       *status = {CMPI_RC_ERR_NOT_FOUND, nullptr};
-      return CMPIData{CMPI_null, CMPI_notFound, {}};
+      return CMPIData{CMPI_string, CMPI_goodValue, {}};  // the status alone says that it means nothing
     }
     *name = object->owner->string(key->name.c_str());
     return good(status, asKey(key->data));

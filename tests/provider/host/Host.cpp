@@ -281,6 +281,35 @@ void useInventory(const char* file) {
   setenv("ORU_LOG_LEVEL", "off", 1);
 }
 
+bool isClean(const std::string& text) {
+  for (std::size_t at = 0; at < text.size();) {
+    const auto byte = [&](std::size_t offset) {
+      return at + offset < text.size() ? static_cast<unsigned char>(text[at + offset]) : 0U;
+    };
+    const std::size_t length = byte(0) < 0x80    ? 1
+                               : byte(0) >= 0xF0 ? 4
+                               : byte(0) >= 0xE0 ? 3
+                               : byte(0) >= 0xC2 ? 2
+                                                 : 0;
+    if (length == 0 || byte(0) > 0xF4) {
+      return false;
+    }
+    unsigned int character = length == 1 ? byte(0) : byte(0) & (0x7FU >> length);
+    for (std::size_t i = 1; i < length; ++i) {
+      if ((byte(i) & 0xC0U) != 0x80) {
+        return false;
+      }
+      character = character << 6U | (byte(i) & 0x3FU);
+    }
+    if (character < 0x20 || (character >= 0x7F && character < 0xA0) || character == 0xFFFE ||
+        character == 0xFFFF || (character >= 0xD800 && character < 0xE000)) {
+      return false;
+    }
+    at += length;
+  }
+  return true;
+}
+
 bool isMapped(const std::string& name) {
   std::ifstream maps("/proc/self/maps");
   for (std::string line; std::getline(maps, line);) {

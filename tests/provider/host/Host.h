@@ -95,6 +95,9 @@ CMPIObjectPath* makePath(tests::FakeCmpi& cmpi, const char* className, const Key
 /// Sets the environment that a program over `INVENTORY_FILE` has.
 void useInventory(const char* file);
 
+/// Whether any XML can hold the text as it is: valid UTF-8 without control characters, U+FFFE and U+FFFF.
+bool isClean(const std::string& text);
+
 /// Whether a file of that name is mapped into this process.
 bool isMapped(const std::string& name);
 

@@ -15,36 +15,6 @@ namespace fs = std::filesystem;
 
 using testing::HasSubstr;
 
-/// Whether XML can hold the text: valid UTF-8 without control characters, U+FFFE and U+FFFF.
-bool isClean(const std::string& text) {
-  for (std::size_t at = 0; at < text.size();) {
-    const auto byte = [&](std::size_t offset) {
-      return at + offset < text.size() ? static_cast<unsigned char>(text[at + offset]) : 0U;
-    };
-    const std::size_t length = byte(0) < 0x80    ? 1
-                               : byte(0) >= 0xF0 ? 4
-                               : byte(0) >= 0xE0 ? 3
-                               : byte(0) >= 0xC2 ? 2
-                                                 : 0;
-    if (length == 0 || byte(0) > 0xF4) {
-      return false;
-    }
-    unsigned int character = length == 1 ? byte(0) : byte(0) & (0x7FU >> length);
-    for (std::size_t i = 1; i < length; ++i) {
-      if ((byte(i) & 0xC0U) != 0x80) {
-        return false;
-      }
-      character = character << 6U | (byte(i) & 0x3FU);
-    }
-    if (character < 0x20 || (character >= 0x7F && character < 0xA0) || character == 0xFFFE ||
-        character == 0xFFFF || (character >= 0xD800 && character < 0xE000)) {
-      return false;
-    }
-    at += length;
-  }
-  return true;
-}
-
 class HostTexts : public testing::Test {
  protected:
   HostTexts() {
@@ -72,8 +42,9 @@ class HostTexts : public testing::Test {
 };
 
 TEST_F(HostTexts, AreCleanWhateverTheMachineHas) {
-  ASSERT_TRUE(isClean("Gr\xC3\xBC\xC3\x9F \xE2\x82\xAC"));
-  ASSERT_FALSE(isClean("a\xC3") || isClean("\x1b") || isClean("\xC2\x85") || isClean("\xED\xA0\x80"));
+  ASSERT_TRUE(host::isClean("Gr\xC3\xBC\xC3\x9F \xE2\x82\xAC"));
+  ASSERT_FALSE(host::isClean("a\xC3") || host::isClean("\x1b") || host::isClean("\xC2\x85") ||
+               host::isClean("\xED\xA0\x80"));
   tests::HostileCmpi cmpi;
   const host::Host providers(cmpi.broker());
   providers.serveUpcalls(cmpi);
@@ -84,7 +55,7 @@ TEST_F(HostTexts, AreCleanWhateverTheMachineHas) {
     for (const host::Object& object : providers.enumerate(host::makePath(cmpi, className)).objects) {
       for (const auto* values : {&object.keys, &object.properties}) {
         for (const auto& [name, value] : *values) {
-          EXPECT_TRUE(isClean(value)) << className << "." << name;
+          EXPECT_TRUE(host::isClean(value)) << className << "." << name;
           all += name + "=" + value + "\n";
           ++texts;
         }

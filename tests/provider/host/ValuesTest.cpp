@@ -107,6 +107,20 @@ TEST_F(HostValues, AreNeverNull) {
   }
 }
 
+// Object managers hand them on as they are.
+TEST_F(HostValues, AreCleanTexts) {
+  const std::map<std::string, std::string> odd = theOne("193@d2").properties;
+  EXPECT_THAT(odd, Contains(Pair("Description", "driver of  beta\xEF\xBF\xBD")));
+  EXPECT_THAT(odd, Contains(Pair("Manufacturer", "Vel mor  \xC3\xA9")));
+  for (const char* className : classes) {
+    for (const Object& object : providers.enumerate(path(className)).objects) {
+      for (const auto& [name, value] : object.properties) {
+        EXPECT_TRUE(host::isClean(value)) << className << '.' << name;
+      }
+    }
+  }
+}
+
 // What is not set comes as a null with the type of its property: here the name of another provider's
 // instance.
 TEST_F(HostValues, OfUpcallsMayBeNullsOfTheirType) {
