@@ -9,16 +9,24 @@ namespace {
 // Hashing is made to cost time and memory: more at once would let strangers slow everybody down.
 constexpr std::size_t loginsAtOnce = 2;
 
+/// Bounds below which nothing would move.
+Settings workable(Settings settings) {
+  constexpr std::size_t smallestQueue = 4096;
+  settings.bounds.queue = std::max(settings.bounds.queue, smallestQueue);
+  settings.bounds.workers = std::max<std::size_t>(settings.bounds.workers, 1);
+  return settings;
+}
+
 }  // namespace
 
 Desk::Desk(const Settings& settings, Handler handler)
-    : settings_(settings),
+    : settings_(workable(settings)),
       handler_(std::move(handler)),
       login_(settings_),
       flusher_(timer_, settings_.bounds.flush),
-      workers_(settings_.bounds.keptWorkers, std::max<std::size_t>(settings_.bounds.workers, 1)),
+      workers_(settings_.bounds.keptWorkers, settings_.bounds.workers),
       logins_(0, loginsAtOnce),
-      parts_{settings_.bounds, workers_, flusher_,
+      parts_{settings_.bounds, workers_, flusher_, wholeBytes_,
              [this](LogLevel level, std::string_view line) { log(level, std::string(line)); }} {}
 
 Desk::~Desk() {

@@ -79,6 +79,7 @@ class Desk {
   const Handler handler_;
   Login login_;
   std::atomic<std::size_t> bytes_ = 0;
+  std::atomic<std::size_t> wholeBytes_ = 0;
   std::atomic<bool> closing_ = false;
   mutable std::mutex mutex_;
   std::condition_variable none_;

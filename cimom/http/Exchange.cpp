@@ -56,9 +56,17 @@ bool Exchange::write(std::string_view bytes) {
   return !cut_;
 }
 
-bool Exchange::refuseTooLarge(std::size_t more) {
+bool Exchange::countWhole(std::size_t more) {
   const std::size_t bound = parts_.bounds.wholeAnswer;
-  if (more <= bound - std::min(bound, queued_)) {
+  if (more > bound - std::min(bound, queued_)) {
+    return false;
+  }
+  counted_ += more;
+  return (parts_.wholeBytes += more) <= parts_.bounds.wholeAnswers;
+}
+
+bool Exchange::refuseTooLarge(std::size_t more) {
+  if (countWhole(more)) {
     return false;
   }
   clear();
@@ -66,8 +74,9 @@ bool Exchange::refuseTooLarge(std::size_t more) {
   fields_ = {{"Content-Type", "text/plain; charset=utf-8"}};
   append("The answer is too large for HTTP/1.0: ask with HTTP/1.1.\n");
   ended_ = true;
-  parts_.log(LogLevel::warning, request.peer + ": an answer to HTTP/1.0 would be larger than " +
-                                    std::to_string(bound) + " bytes and was refused");
+  parts_.log(LogLevel::warning,
+             request.peer +
+                 ": an answer to HTTP/1.0 was refused: it, or all of them, would be too large to be held");
   return true;
 }
 
@@ -102,6 +111,8 @@ void Exchange::clear() {
   pieces_.clear();
   taken_ = 0;
   queued_ = 0;
+  parts_.wholeBytes -= counted_;
+  counted_ = 0;
 }
 
 void Exchange::fail(std::vector<Field> trailers) {

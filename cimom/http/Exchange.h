@@ -27,12 +27,16 @@ struct ExchangeParts {
   const Bounds& bounds;
   Workers& workers;
   Flusher& flusher;
+  std::atomic<std::size_t>& wholeBytes;  ///< of the answers that are sent when they are whole
   std::function<void(LogLevel, std::string_view)> log;
 };
 
 class Exchange : public Answer, public std::enable_shared_from_this<Exchange> {
  public:
   explicit Exchange(const ExchangeParts& parts) : parts_(parts) {}
+  ~Exchange() override { parts_.wholeBytes -= counted_; }
+  Exchange(const Exchange&) = delete;
+  Exchange& operator=(const Exchange&) = delete;
 
   Request request;  ///< constant from `hold` on
 
@@ -68,6 +72,7 @@ class Exchange : public Answer, public std::enable_shared_from_this<Exchange> {
 
  private:
   bool refuseTooLarge(std::size_t more);
+  bool countWhole(std::size_t more);
   bool waitForSpace(std::unique_lock<std::mutex>& lock);
   void append(std::string_view bytes);
   void wake();
@@ -96,8 +101,9 @@ class Exchange : public Answer, public std::enable_shared_from_this<Exchange> {
   std::vector<Field> fields_;
   std::vector<Field> trailers_;
   std::deque<std::string> pieces_;
-  std::size_t taken_ = 0;   ///< bytes of the first piece that were taken
-  std::size_t queued_ = 0;  ///< bytes that wait
+  std::size_t taken_ = 0;    ///< bytes of the first piece that were taken
+  std::size_t queued_ = 0;   ///< bytes that wait
+  std::size_t counted_ = 0;  ///< of them, among all whole answers
   Clock::time_point lastTaken_;
 };
 

@@ -29,20 +29,21 @@ struct Listener {
 };
 
 struct Bounds {
-  std::size_t header = 16UL * 1024;              ///< bytes of request line and headers; 431
-  std::size_t body = 1024UL * 1024;              ///< bytes of a request's body; 413
-  std::size_t bodies = 64UL * 1024 * 1024;       ///< bytes of all bodies held at once; 503
-  std::size_t queue = 256UL * 1024;              ///< bytes of one answer that wait for the client
-  std::size_t wholeAnswer = 32UL * 1024 * 1024;  ///< bytes of an answer to an HTTP/1.0 client; 500
-  std::size_t connections = 512;                 ///< at once, over all listeners
-  std::size_t connectionsPerAddress = 256;       ///< at once, by IPv4 address or IPv6 /64
-  std::size_t workers = 16;                      ///< handlers that work at once
-  std::size_t keptWorkers = 2;                   ///< threads that stay when there is nothing to do
-  std::chrono::milliseconds idle{30'000};        ///< silence on a connection that is to send a request
-  std::chrono::milliseconds request{60'000};     ///< for one request to arrive, however busily it drips
-  std::chrono::milliseconds stall{30'000};       ///< a client takes nothing of its answer
-  std::chrono::milliseconds flush{10};           ///< a small piece of an answer waits for more to join it
-  std::chrono::milliseconds loginDelay{500};     ///< after the first failed login; doubles with each
+  std::size_t header = 16UL * 1024;                ///< bytes of request line and headers; 431
+  std::size_t body = 1024UL * 1024;                ///< bytes of a request's body; 413
+  std::size_t bodies = 64UL * 1024 * 1024;         ///< bytes of all bodies held at once; 503
+  std::size_t queue = 256UL * 1024;                ///< bytes of one answer that wait for the client
+  std::size_t wholeAnswer = 32UL * 1024 * 1024;    ///< bytes of an answer to an HTTP/1.0 client; 500
+  std::size_t wholeAnswers = 128UL * 1024 * 1024;  ///< bytes of all such answers held at once; 500
+  std::size_t connections = 512;                   ///< at once, over all listeners
+  std::size_t connectionsPerAddress = 256;         ///< at once, by IPv4 address or IPv6 /64
+  std::size_t workers = 16;                        ///< handlers that work at once
+  std::size_t keptWorkers = 2;                     ///< threads that stay when there is nothing to do
+  std::chrono::milliseconds idle{30'000};          ///< silence on a connection that is to send a request
+  std::chrono::milliseconds request{60'000};       ///< for one request to arrive, however busily it drips
+  std::chrono::milliseconds stall{30'000};         ///< a client takes nothing of its answer
+  std::chrono::milliseconds flush{10};             ///< a small piece of an answer waits for more to join it
+  std::chrono::milliseconds loginDelay{500};       ///< after the first failed login; doubles with each
   std::chrono::milliseconds longestLoginDelay{10'000};  ///< no login waits for longer: 429
   std::chrono::milliseconds rememberedLogin{300'000};   ///< a login is not hashed anew for so long
   std::chrono::milliseconds rememberedFailure{

@@ -15,6 +15,7 @@ class Answers : public testing::Test {
 };
 
 TEST_F(Answers, ShortAnswerHasItsLength) {
+  settings_.bounds.flush = std::chrono::hours(1);
   Server server(settings_, [](const Request&, Answer& answer) {
     beginText(answer, {{"X-Own", "yes"}, {"Ext", ""}});
     answer.write("one, ");
@@ -168,10 +169,46 @@ TEST_F(Answers, HttpOneZeroIsRefusedWhatIsTooLarge) {
   EXPECT_TRUE(answer.isComplete);
   EXPECT_NE(answer.body.find("HTTP/1.1"), std::string::npos) << answer.body;
   EXPECT_FALSE(wentOn);
-  EXPECT_TRUE(log_.waitFor("would be larger than 100000 bytes"));
+  EXPECT_TRUE(log_.waitFor("would be too large"));
+}
+
+TEST_F(Answers, ToHttpOneZeroShareABound) {
+  settings_.bounds.wholeAnswers = 100'000;
+  Signal arrived;
+  Signal go;
+  Server server(settings_, [&](const Request& request, Answer& answer) {
+    beginText(answer);
+    answer.write(std::string(60'000, 'x'));
+    if (request.target == "/first") {
+      arrived.set();
+      EXPECT_TRUE(go.wait());
+    }
+  });
+  HttpConnection first(server.port());
+  first.send(httpRequest("GET", "/first", {}, "", "HTTP/1.0"));
+  ASSERT_TRUE(arrived.wait());
+  EXPECT_EQ(HttpConnection(server.port()).ask(httpRequest("GET", "/", {}, "", "HTTP/1.0")).status, 500);
+  go.set();
+  EXPECT_EQ(first.readAnswer().body.size(), 60'000U);
+  EXPECT_TRUE(eventually([&] {
+    return HttpConnection(server.port()).ask(httpRequest("GET", "/", {}, "", "HTTP/1.0")).status == 200;
+  }));
+}
+
+TEST_F(Answers, SmallestBoundsStillWork) {
+  settings_.bounds.queue = 0;
+  settings_.bounds.workers = 0;
+  settings_.bounds.keptWorkers = 0;
+  Server server(settings_, [](const Request&, Answer& answer) {
+    beginText(answer);
+    EXPECT_TRUE(answer.write(pattern(100'000)));
+  });
+  HttpConnection client(server.port());
+  EXPECT_TRUE(client.ask(httpRequest("GET", "/")).body == pattern(100'000));
 }
 
 TEST_F(Answers, HeadHasNoBody) {
+  settings_.bounds.flush = std::chrono::hours(1);
   Server server(settings_, echo);
   HttpConnection client(server.port());
   client.send(httpRequest("HEAD", "/") + httpRequest("GET", "/"));

@@ -90,6 +90,7 @@ TEST_F(Failures, HandlerThatSaysNothing) {
 }
 
 TEST_F(Failures, HandlerThatThrows) {
+  settings_.bounds.flush = std::chrono::hours(1);
   Server server(settings_, [](const Request& request, Answer& answer) {
     if (request.target == "/other") {
       throw 1;
@@ -100,7 +101,6 @@ TEST_F(Failures, HandlerThatThrows) {
     }
     throw std::runtime_error("the disk is gone");
   });
-  settings_.bounds.flush = std::chrono::hours(1);
   HttpConnection client(server.port());
   const HttpAnswer answer = client.ask(httpRequest("GET", "/"));
   EXPECT_EQ(answer.status, 500);

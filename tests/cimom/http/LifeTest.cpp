@@ -186,10 +186,9 @@ TEST_F(Life, DestructorEndsWhatIsThere) {
     clients.emplace_back(server.port()).send("GET / HT");
     ASSERT_TRUE(arrived.wait());
     ASSERT_TRUE(eventually([&] { return server.requestsUnderWay() == 2; }));
-    std::thread([&go] {
-      std::this_thread::sleep_for(std::chrono::milliseconds(50));
-      go.set();
-    }).detach();
+    EXPECT_FALSE(server.stop(std::chrono::milliseconds(10)));
+    EXPECT_EQ(ended, 0);
+    go.set();
   }
   EXPECT_EQ(ended, 1) << "what nobody waits for any more is not begun";
   for (HttpConnection& client : clients) {

@@ -137,7 +137,7 @@ TEST_F(Requests, ThatAreBrokenAreRefused) {
       "POST / HTTP/1.1\r\nHost: x\r\nTransfer-Encoding: chunked\r\nContent-Length: 4\r\n\r\n0\r\n\r\n",
       "GET / HTTP/9.9\r\nHost: x\r\n\r\n",
       "\x16\x03\x01\x02garbage that is no HTTP\r\n\r\n",
-      std::string("GET \0/ HTTP/1.1\r\nHost: x\r\n\r\n", 32),
+      std::string("GET ") + '\0' + "/ HTTP/1.1\r\nHost: x\r\n\r\n",
   };
   for (const std::string& request : broken) {
     HttpConnection client(server.port());
