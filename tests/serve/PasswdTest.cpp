@@ -58,7 +58,8 @@ TEST_F(Passwd, AddsAUserThenChangesThePassword) {
 TEST_F(Passwd, TakesAUserOut) {
   Secrets::setPassword(file, "ada", "a");
   Secrets::setPassword(file, "bob", "b");
-  EXPECT_EQ(cli_test::swinv({"passwd", file, "ada", "--delete"}).standardOutput, "Removed ada from " + file + "\n");
+  EXPECT_EQ(cli_test::swinv({"passwd", file, "ada", "--delete"}).standardOutput,
+            "Removed ada from " + file + "\n");
   EXPECT_FALSE(lets("ada", "a"));
   EXPECT_TRUE(lets("bob", "b"));
   const Result again = cli_test::swinv({"passwd", file, "ada", "--delete"});
