@@ -65,6 +65,13 @@ std::string urls(const cimom::http::Server& server, const cimom::http::Settings&
   return lines;
 }
 
+void logCounters(const cimom::ObjectManager& manager, const ServeLog& log) {
+  if (const std::uint64_t unfinished = manager.unfinishedAnswers(); unfinished != 0) {
+    log.write(ServerLevel::info, "answers that were OK without a provider's done marker, since the start: " +
+                                     std::to_string(unfinished));
+  }
+}
+
 void reload(cimom::http::Server& server, const ServeLog& log) {
   notifyReloading();
   const std::vector<std::string> problems = server.reload();
@@ -106,9 +113,11 @@ void runServe(const Options& options, Output& output) {
   notifyServiceManager("READY=1");
   while (signals.next() == ServeSignal::Reload) {
     reload(*server, log);
+    logCounters(*manager, log);
   }
   signals.stopAtOnceFromNow();
   stop(*server, endpoint, log);
+  logCounters(*manager, log);
 }
 
 }  // namespace cli

@@ -80,6 +80,7 @@ TEST_F(OwnProvider, ThatIsNotDoneIsOkWithWhatItDeliveredAndLogged) {
   EXPECT_THAT(answer.keys("Name"), ElementsAre("first"));
   EXPECT_TRUE(served.logs("TEST_NoDone")) << served.log();
   EXPECT_EQ(served.end(), 0);
+  EXPECT_THAT(served.log(), HasSubstr("done marker, since the start: 1"));
 }
 
 TEST_F(OwnProvider, ThatFailsInTheMiddleIsNotSwallowed) {
