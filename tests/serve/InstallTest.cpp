@@ -1,6 +1,8 @@
 // What `cmake --install` lays out: complete, found from wherever it lies, and nothing of the build tree in
 // it.
 #include "../cli/Process.h"
+#include "CimClient.h"
+#include "Served.h"
 #include "tests/support/ElfFile.h"
 
 #include <gmock/gmock.h>
@@ -127,6 +129,11 @@ TEST_F(Install, RunsFromWhereItLiesAndFromWhereItWasMoved) {
     EXPECT_EQ(result.exitCode, 0) << result.standardError;
     EXPECT_THAT(result.standardOutput, AllOf(HasSubstr("BMC Firmware"), HasSubstr("velmor25 driver")));
   }
+  serve_test::ServeStart start;
+  start.program = moved / "bin" / "swinv";
+  serve_test::Served served(start);
+  EXPECT_EQ(serve_test::CimClient(served.port()).countIdentities(), 19U);
+  EXPECT_EQ(served.end(), 0) << served.log();
   // What is missing is missed, and not taken from the build tree.
   fs::remove(moved / "lib" / "liboru.so");
   EXPECT_EQ(run({list, {}, moved / "bin" / "swinv"}).exitCode, 1);
