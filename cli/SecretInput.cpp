@@ -1,10 +1,10 @@
 #include <cli/Messages.h>
 #include <cli/SecretInput.h>
 
-#include <algorithm>
 #include <cerrno>
 #include <csignal>
 #include <cstring>
+#include <system_error>
 
 #include <fcntl.h>
 #include <termios.h>
@@ -69,8 +69,7 @@ std::string readLine(int descriptor) {
       continue;
     }
     if (got < 0) {
-      throw CommandError("the password cannot be read: " +
-                         std::string(std::strerror(errno)));  // NOLINT(concurrency-mt-unsafe): one thread
+      throw CommandError("the password cannot be read: " + std::generic_category().message(errno));
     }
     if (got == 0 || byte == '\n') {
       return line;

@@ -35,7 +35,6 @@ void lookAtMachineAnew() {
   if (library == nullptr) {
     return;  // nobody has asked yet: the first request looks
   }
-  // NOLINTNEXTLINE(cppcoreguidelines-pro-type-reinterpret-cast): what POSIX has dlsym for
   const auto look = reinterpret_cast<decltype(&oruLookAnew)>(dlsym(library, agent::oruLookAnewName));
   if (look != nullptr) {
     look();

@@ -89,7 +89,6 @@ void notifyServiceManager(std::string_view state) {
     return;
   }
   const auto length = static_cast<socklen_t>(offsetof(sockaddr_un, sun_path) + path.size());
-  // NOLINTNEXTLINE(cppcoreguidelines-pro-type-reinterpret-cast): the sockets interface is made of such casts
   static_cast<void>(sendto(channel, state.data(), state.size(), MSG_NOSIGNAL,
                            reinterpret_cast<const sockaddr*>(&address), length));
   close(channel);

@@ -12,13 +12,13 @@ using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
 
-cli::Options parsed(std::vector<std::string> arguments) {
+cli::Options parsed(const std::vector<std::string>& arguments) {
   const cli::CommandLine line = cli::parseCommandLine(arguments);
   EXPECT_TRUE(line.options.has_value()) << line.standardError;
   return line.options.value_or(cli::Options());
 }
 
-void expectUsageError(std::vector<std::string> arguments, const std::string& message) {
+void expectUsageError(const std::vector<std::string>& arguments, const std::string& message) {
   const cli::CommandLine line = cli::parseCommandLine(arguments);
   EXPECT_FALSE(line.options.has_value());
   EXPECT_EQ(line.exitCode, 2);

@@ -23,7 +23,6 @@ using serve_test::post;
 using serve_test::readCim;
 using serve_test::Served;
 using serve_test::valueParameter;
-using testing::AllOf;
 using testing::AnyOf;
 using testing::ElementsAre;
 using testing::HasSubstr;

@@ -25,9 +25,7 @@ using cli_test::TemporaryFolder;
 using serve_test::Secrets;
 using testing::AllOf;
 using testing::HasSubstr;
-using testing::IsEmpty;
 using testing::Not;
-using testing::SizeIs;
 
 class Passwd : public testing::Test {
  protected:

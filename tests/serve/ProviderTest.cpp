@@ -18,7 +18,6 @@ using serve_test::classParameter;
 using serve_test::post;
 using serve_test::Served;
 using serve_test::ServeStart;
-using testing::AllOf;
 using testing::ElementsAre;
 using testing::HasSubstr;
 using tests::HttpAnswer;

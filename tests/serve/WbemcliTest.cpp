@@ -12,7 +12,6 @@
 namespace {
 
 using serve_test::Printed;
-using serve_test::PrintedObject;
 using serve_test::Secrets;
 using serve_test::Served;
 using serve_test::ServeStart;
