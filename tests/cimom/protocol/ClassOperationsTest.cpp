@@ -8,7 +8,6 @@ using protocol_test::flag;
 using protocol_test::Given;
 using protocol_test::properties;
 using protocol_test::Protocol;
-using protocol_test::text;
 using protocol_test::texts;
 using testing::AllOf;
 using testing::Contains;

@@ -5,15 +5,12 @@
 
 namespace {
 
-using protocol_test::className;
-using protocol_test::errorCode;
 using protocol_test::header;
 using protocol_test::Protocol;
 using protocol_test::Recorded;
 using protocol_test::removeHeader;
 using protocol_test::request;
 using protocol_test::Request;
-using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
 

@@ -15,7 +15,6 @@ using protocol_test::request;
 using protocol_test::text;
 using protocol_test::texts;
 using testing::Contains;
-using testing::Each;
 using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;

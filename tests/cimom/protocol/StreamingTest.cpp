@@ -7,7 +7,6 @@ using protocol_test::className;
 using protocol_test::Control;
 using protocol_test::errorCode;
 using protocol_test::errorText;
-using protocol_test::Field;
 using protocol_test::instanceName;
 using protocol_test::names;
 using protocol_test::Protocol;
@@ -16,7 +15,6 @@ using protocol_test::request;
 using protocol_test::Request;
 using testing::ElementsAre;
 using testing::HasSubstr;
-using testing::IsEmpty;
 using testing::Not;
 using testing::SizeIs;
 
