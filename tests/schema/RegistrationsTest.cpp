@@ -20,9 +20,7 @@ using cimom::ClassRepository;
 using cimom::ProviderRegistration;
 using cimom::mof::InstanceDeclaration;
 using cimom::mof::Scalar;
-using testing::ElementsAre;
 using testing::HasSubstr;
-using testing::IsEmpty;
 using testing::MatchesRegex;
 using testing::Not;
 

@@ -15,7 +15,6 @@
 
 namespace {
 
-using testing::Not;
 
 constexpr const char* inventoryLibrary = "libSoftwareInventoryProvider.so";
 constexpr const char* endpointLibrary = "libKelvoEndpointProvider.so";

@@ -8,8 +8,6 @@ namespace {
 
 using host::Answer;
 using testing::Contains;
-using testing::ElementsAre;
-using testing::Not;
 
 class HostTables : public HostTest {};
 
