@@ -36,11 +36,11 @@ class RequestError : public std::runtime_error {
 
 /// How much one request may hold. The size of the whole body is the transport's to bound.
 struct Limits {
-  std::size_t depth = 64;                    ///< elements in each other
-  std::size_t elements = 100'000;            ///< of the document
-  std::size_t attributes = 32;               ///< of an element
-  std::size_t attributeLength = 64 * 1024;   ///< bytes of one value
-  std::size_t textLength = 4 * 1024 * 1024;  ///< bytes of one element's text
+  std::size_t depth = 64;                                 ///< elements in each other
+  std::size_t elements = 100'000;                         ///< of the document
+  std::size_t attributes = 32;                            ///< of an element
+  std::size_t attributeLength = std::size_t{64} * 1024;   ///< bytes of one value
+  std::size_t textLength = std::size_t{4} * 1024 * 1024;  ///< bytes of one element's text
 };
 
 /// Throws `RequestError`.
