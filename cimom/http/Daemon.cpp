@@ -137,7 +137,9 @@ void Daemon::notify(void* daemon, MHD_Connection* connection, void** context,
 void Daemon::say(void* daemon, const char* format, va_list arguments) {
   constexpr std::size_t longestLine = 512;
   std::array<char, longestLine> line{};
-  std::vsnprintf(line.data(), line.size(), format, arguments);
+  if (std::vsnprintf(line.data(), line.size(), format, arguments) < 0) {
+    return;
+  }
   std::string_view text(line.data());
   while (!text.empty() && text.back() == '\n') {
     text.remove_suffix(1);

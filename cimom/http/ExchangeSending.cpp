@@ -4,7 +4,6 @@
 #include <strings.h>
 
 #include <algorithm>
-#include <cstring>
 #include <new>
 
 namespace cimom::http {
@@ -139,7 +138,7 @@ ssize_t Exchange::take(char* buffer, std::size_t size) {
   while (moved < size && queued_ > 0) {
     const std::string& piece = pieces_.front();
     const std::size_t count = std::min(size - moved, piece.size() - taken_);
-    std::memcpy(buffer + moved, piece.data() + taken_, count);
+    piece.copy(buffer + moved, count, taken_);
     moved += count;
     taken_ += count;
     queued_ -= count;
