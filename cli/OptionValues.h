@@ -5,7 +5,7 @@
 #include <optional>
 #include <string>
 
-namespace CLI {
+namespace CLI {  // NOLINT(readability-identifier-naming): the library's own
 class App;
 }
 

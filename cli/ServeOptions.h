@@ -9,7 +9,7 @@
 #include <string_view>
 #include <vector>
 
-namespace CLI {
+namespace CLI {  // NOLINT(readability-identifier-naming): the library's own
 class App;
 }
 

@@ -243,7 +243,7 @@ TEST_F(Client, TwoHundredConnectionsAtOnce) {
   EXPECT_EQ(client.countIdentities(), 19U);
 }
 
-constexpr std::size_t many = 3000;
+constexpr std::size_t many = 1500;
 
 TEST(ClientOfALargeMachine, GetsTheAnswerInChunksAsItIsMade) {
   const serve_test::InventoryFile inventory(bigInventory(many));

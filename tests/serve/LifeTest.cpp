@@ -39,7 +39,7 @@ using tests::HttpAnswer;
 using tests::HttpConnection;
 using tests::HttpTls;
 
-constexpr std::size_t many = 3000;
+constexpr std::size_t many = 1500;
 const std::string example = cli_test::testFile("examples/server.json");
 
 std::string wholeInventory(const tests::HttpFields& fields = {}) {

@@ -44,6 +44,10 @@ std::string port(const std::string& id) {
          id + "\"";
 }
 
+/// What every software identity conforms to.
+const std::string profile =
+    R"(root/interop:CIM_RegisteredProfile.InstanceID="KELVO:DSP1023-SoftwareInventory-1.0.1")";
+
 // As the README lists them.
 const std::string bios = identity("1@a1f98e803e58ca6");
 const std::string bmc = identity("1@b3512e37f41e292");
@@ -151,16 +155,18 @@ TEST_P(Wbemcli, OneInstance) {
 }
 
 TEST_P(Wbemcli, AssociatorsInBothDirections) {
-  EXPECT_THAT(ask("ain", bmc).paths(), UnorderedElementsAre(atlas, controller));
-  EXPECT_THAT(ask("ain", bios).paths(), ElementsAre(atlas)) << "once, though two associations lead there";
-  EXPECT_THAT(ask("ain", networkFirmware).paths(), UnorderedElementsAre(atlas, port("0000:3b:00.0/1")));
+  EXPECT_THAT(ask("ain", bmc).paths(), UnorderedElementsAre(profile, atlas, controller));
+  EXPECT_THAT(ask("ain", bios).paths(), UnorderedElementsAre(profile, atlas))
+      << "the computer once, though two associations lead there";
+  EXPECT_THAT(ask("ain", networkFirmware).paths(),
+              UnorderedElementsAre(profile, atlas, port("0000:3b:00.0/1")));
   EXPECT_THAT(ask("ain", controller).paths(), ElementsAre(bmc));
   EXPECT_THAT(ask("ain", port("0000:3b:00.0/2")).paths(),
               UnorderedElementsAre(networkFirmware, identity("86975819633663267@83c1823c6090d0a")));
 
   EXPECT_THAT(ask("ai", atlas).values("VersionString"), SizeIs(19));
   const Printed ports = ask("ai", networkFirmware);
-  EXPECT_THAT(ports.paths(), UnorderedElementsAre(atlas, port("0000:3b:00.0/1")));
+  EXPECT_THAT(ports.paths(), UnorderedElementsAre(profile, atlas, port("0000:3b:00.0/1")));
   EXPECT_THAT(ports.values("PermanentAddress"), Contains(HasSubstr("02005e100001")))
       << "as KELVO_NetworkPort has it";
 }
