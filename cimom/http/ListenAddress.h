@@ -3,6 +3,7 @@
 
 #include <sys/socket.h>
 
+#include <cstdint>
 #include <string>
 #include <string_view>
 

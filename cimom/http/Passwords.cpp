@@ -2,6 +2,7 @@
 #include <crypt.h>
 
 #include <algorithm>
+#include <cerrno>
 #include <cstring>
 #include <memory>
 #include <optional>
@@ -63,7 +64,7 @@ std::string hashPassword(std::string_view password) {
     throw PasswordError(std::string("this system's crypt(3) makes no yescrypt hashes: ") +
                         std::strerror(errno));
   }
-  const auto hash = hashWith(password, setting.c_str());
+  const auto hash = hashWith(password, setting);
   if (!hash) {
     throw PasswordError("this system's crypt(3) cannot hash the password");
   }
