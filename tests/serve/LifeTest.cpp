@@ -209,6 +209,24 @@ TEST(ServeStartUp, ListensAtSeveralPlaces) {
   EXPECT_EQ(served.end(), 0);
 }
 
+TEST(ServeStartUp, LetsInWhoHasACertificateOrAPassword) {
+  const Secrets secrets;
+  ServeStart start = secured(secrets);
+  start.arguments.insert(start.arguments.end(), {"--client-ca", secrets.file("ca.pem").string()});
+  Served served(start);
+  const tests::Certificate known =
+      tests::makeCertificate("console", tests::CertificateUse::client, &secrets.authority());
+  HttpTls tls = trustIn(secrets.authority());
+  HttpConnection nobody(served.port(), tls);
+  EXPECT_EQ(nobody.ask(wholeInventory()).status, 401);
+  EXPECT_EQ(loginStatus(served, tls, "analytical"), 200);
+  tls.certificate = known.certificate;
+  tls.key = known.key;
+  HttpConnection console(served.port(), tls);
+  EXPECT_EQ(console.ask(wholeInventory()).status, 200);
+  EXPECT_EQ(served.end(), 0);
+}
+
 /// A socket of the test's own.
 class Socket {
  public:
