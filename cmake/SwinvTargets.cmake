@@ -55,6 +55,11 @@ endfunction()
 # A GoogleTest program; each of its cases is a test of its own under CTest.
 #
 # A process may end while the machine is looked at in the background: a thread that is there at its end is no finding.
+#
+# Sanitized tests take longer to optimise than they run; what they test is optimised.
+if(SWINV_SANITIZE)
+  set(testOptimisation -O0)
+endif()
 if(SWINV_SANITIZE MATCHES thread)
   set(testSanitizer ENVIRONMENT_MODIFICATION TSAN_OPTIONS=set:report_thread_leaks=0)
 endif()
@@ -66,7 +71,7 @@ function(swinv_test name)
   # GCC 12 takes moves of short constant strings, such as the paths below, for copies out of bounds, or not, by their
   # length, which is the checkout's. Clang and the sanitizers watch the bounds of tests.
   target_compile_options(${name} PRIVATE
-    $<$<CXX_COMPILER_ID:GNU>:${unreliableWarnings}>)
+    $<$<CXX_COMPILER_ID:GNU>:${unreliableWarnings}> ${testOptimisation})
   target_precompile_headers(${name} REUSE_FROM test_headers)
   if(ARG_DEPENDS)
     add_dependencies(${name} ${ARG_DEPENDS})
