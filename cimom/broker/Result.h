@@ -25,7 +25,7 @@ class ResultSink {
 
 enum class Recycling {
   Off,       ///< what the provider makes lives until its request ends
-  OnReturn,  ///< and this: until it returns the next object (`Request::recycle`)
+  OnReturn,  ///< and this: until it returns an object, which goes as well (`Request::recycle`)
 };
 
 /// Lives where the host puts it, for one call of a provider. Nulls and foreign objects are answered with

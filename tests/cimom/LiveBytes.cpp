@@ -24,6 +24,15 @@ void* operator new(std::size_t size) {
   return memory;
 }
 
+// Sanitizers have one of their own for this, whose memory no other `delete` may take.
+void* operator new(std::size_t size, const std::nothrow_t& /*tag*/) noexcept {
+  try {
+    return operator new(size);
+  } catch (const std::bad_alloc&) {
+    return nullptr;
+  }
+}
+
 void operator delete(void* memory) noexcept {
   if (memory != nullptr)
     live -= malloc_usable_size(memory);
