@@ -126,7 +126,7 @@ TEST_F(PullThreads, manyClientsAtOnce) {
   constexpr int rounds = 20;
   control_.set(&Control::size, 50);
   settings_.waitingObjects = 3;
-  settings_.contexts = 8 * clients;  // closed ones count until their providers have returned
+  settings_.contexts = std::size_t{8} * clients;  // closed ones count until their providers have returned
   restart();
   std::atomic<int> complete = 0;
   const auto client = [&](int number) {
