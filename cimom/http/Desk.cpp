@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <exception>
+#include <utility>
 
 namespace cimom::http {
 namespace {
@@ -19,8 +20,8 @@ Settings workable(Settings settings) {
 
 }  // namespace
 
-Desk::Desk(const Settings& settings, Handler handler)
-    : settings_(workable(settings)),
+Desk::Desk(Settings settings, Handler handler)
+    : settings_(workable(std::move(settings))),
       handler_(std::move(handler)),
       login_(settings_),
       flusher_(timer_, settings_.bounds.flush),

@@ -28,7 +28,7 @@ struct Refusal {
 class Desk {
  public:
   /// Throws what `Login` throws.
-  Desk(const Settings& settings, Handler handler);
+  Desk(Settings settings, Handler handler);
   ~Desk();
   Desk(const Desk&) = delete;
   Desk& operator=(const Desk&) = delete;

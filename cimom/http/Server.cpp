@@ -6,6 +6,7 @@
 #include <list>
 #include <mutex>
 #include <stdexcept>
+#include <utility>
 
 namespace cimom::http {
 namespace {
@@ -53,7 +54,7 @@ void checkFiles(const Settings& settings) {
 
 class Server::Core {
  public:
-  Core(const Settings& settings, Handler handler);
+  Core(Settings given, Handler handler);
   ~Core();
   Core(const Core&) = delete;
   Core& operator=(const Core&) = delete;
@@ -89,8 +90,9 @@ class Server::Core {
   std::unique_ptr<Acceptor> acceptor_;
 };
 
-Server::Core::Core(const Settings& settings, Handler handler)
-    : desk_(settings, std::move(handler)), connections_(desk_.settings().bounds) {
+Server::Core::Core(Settings given, Handler handler)
+    : desk_(std::move(given), std::move(handler)), connections_(desk_.settings().bounds) {
+  const Settings& settings = desk_.settings();
   checkFiles(settings);
   std::vector<ListeningSocket> sockets;
   for (const Listener& listener : settings.listeners) {
@@ -218,7 +220,7 @@ bool Server::Core::stop(std::chrono::milliseconds patience) {
 }
 
 Server::Server(Settings settings, Handler handler)
-    : core_(std::make_unique<Core>(settings, std::move(handler))) {}
+    : core_(std::make_unique<Core>(std::move(settings), std::move(handler))) {}
 
 Server::~Server() = default;
 
