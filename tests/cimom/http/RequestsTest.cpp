@@ -208,6 +208,7 @@ TEST_F(Requests, OnTwoHundredConnectionsAreServed) {
   settings_.bounds.workers = 4;
   Server server(settings_, echo);
   std::vector<HttpConnection> clients;
+  clients.reserve(many);
   for (int next = 0; next < many; ++next) {
     clients.emplace_back(server.port());
   }

@@ -78,11 +78,11 @@ TEST_F(SlowClients, AreCutByTime) {
 
 TEST_F(SlowClients, AreCutAfterTheHandlerHasReturned) {
   settings_.bounds.stall = std::chrono::milliseconds(300);
-  settings_.bounds.queue = 64'000'000;
+  settings_.bounds.queue = 16'000'000;
   std::atomic<bool> returned = false;
   Server server(settings_, [&](const Request&, Answer& answer) {
     beginText(answer);
-    answer.write(std::string(32'000'000, 'x'));
+    answer.write(std::string(8'000'000, 'x'));
     returned = true;
   });
   HttpConnection client(server.port(), false, smallBuffer);
