@@ -31,20 +31,20 @@ using testing::UnorderedElementsAre;
 class Install : public testing::Test {
  protected:
   static void SetUpTestSuite() {
-    folder_ = new TemporaryFolder;
-    prefix_ = new fs::path(folder_->at("opt"));
-    result_ = new Result(
-        run({{"--install", SWINV_BUILD_FOLDER, "--prefix", prefix_->string()}, {}, CMAKE_PROGRAM}));
+    ownFolder = new TemporaryFolder;
+    ownPrefix = new fs::path(ownFolder->at("opt"));
+    ownResult = new Result(
+        run({{"--install", SWINV_BUILD_FOLDER, "--prefix", ownPrefix->string()}, {}, CMAKE_PROGRAM}));
   }
   static void TearDownTestSuite() {
-    delete result_;
-    delete prefix_;
-    delete folder_;
+    delete ownResult;
+    delete ownPrefix;
+    delete ownFolder;
   }
 
-  void SetUp() override { ASSERT_EQ(result_->exitCode, 0) << result_->standardError; }
+  void SetUp() override { ASSERT_EQ(ownResult->exitCode, 0) << ownResult->standardError; }
 
-  static fs::path at(const char* name) { return *prefix_ / name; }
+  static fs::path at(const char* name) { return *ownPrefix / name; }
 
   static std::set<std::string> namesIn(const char* folder) {
     std::set<std::string> names;
@@ -55,9 +55,9 @@ class Install : public testing::Test {
   }
 
  private:
-  inline static TemporaryFolder* folder_ = nullptr;
-  inline static fs::path* prefix_ = nullptr;
-  inline static Result* result_ = nullptr;
+  inline static TemporaryFolder* ownFolder = nullptr;
+  inline static fs::path* ownPrefix = nullptr;
+  inline static Result* ownResult = nullptr;
 };
 
 std::set<std::string> sourcesWith(const char* extension) {
