@@ -13,9 +13,11 @@ void runGet(const Options& options, Output& output);
 void runAssociators(const Options& options, Output& output);
 void runTree(const Options& options, Output& output);
 void runCapture(const Options& options, Output& output);
-void runServe(const Options& options, Output& output);
-void runPasswd(const Options& options, Output& output);
 void runRegister(const Options& options, Output& output);
 void runUnregister(const Options& options, Output& output);
+
+// In the program of the endpoint alone (cli/Endpoint.h).
+void runServe(const Options& options, Output& output);
+void runPasswd(const Options& options, Output& output);
 
 }  // namespace cli

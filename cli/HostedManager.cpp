@@ -50,6 +50,7 @@ void applyProvider(const fs::path& file, cimom::Configuration& configuration) {
     for (cimom::ProviderRegistration& registration : configuration.providers) {
       if (registration.location == inventoryProvider) {
         registration.location = absolute.string();
+        registration.keepsNothing = false;  // nobody knows of this one
       }
     }
     return;
@@ -70,6 +71,12 @@ cimom::Configuration configure(const Options& options) {
   // In the order of their names: the CIM schema's files, which include what they stand on, before this
   // system's.
   configuration.schema = schemaFiles(layout.schema, ".mof");
+  if (options.command != Command::Serve) {
+    // What the interop namespace is made of: nobody can ask for it, and every command would wait for it.
+    std::erase_if(configuration.schema, [](const fs::path& file) {
+      return file.filename() == "CIM_Interop.mof" || file.filename() == "interop.mof";
+    });
+  }
   configuration.providerFolder = layout.libraries;
   configuration.schema.insert(configuration.schema.end(), options.schema.begin(), options.schema.end());
   for (const fs::path& file : schemaFiles(layout.schema, ".reg")) {

@@ -12,7 +12,7 @@ Layout ownLayout() {
     throw CommandError("cannot tell where swinv is installed: /proc/self/exe: " + error.message());
   }
   const std::filesystem::path root = executable.parent_path().parent_path();
-  Layout layout{root / "lib", root / "share" / "swinv" / "schema"};
+  Layout layout{root / "lib", root / "share" / "swinv" / "schema", root / "libexec" / "swinv-endpoint"};
   if (!std::filesystem::is_directory(layout.schema, error)) {
     throw CommandError("the CIM schema is missing: there is no folder " + layout.schema.string() +
                        "\nIt belongs to swinv; install or build swinv again.");

@@ -8,6 +8,7 @@ namespace cli {
 struct Layout {
   std::filesystem::path libraries;  ///< ../lib
   std::filesystem::path schema;     ///< ../share/swinv/schema
+  std::filesystem::path endpoint;   ///< ../libexec/swinv-endpoint
 };
 
 /// Throws `CommandError` where the schema is not there; providers are looked for when they are loaded.

@@ -1,4 +1,5 @@
 #include <cli/Commands.h>
+#include <cli/Endpoint.h>
 #include <cli/Messages.h>
 #include <cli/Source.h>
 
@@ -24,7 +25,7 @@ void occupyStandardDescriptors() {
   }
 }
 
-void run(const cli::Options& options, cli::Output& output) {
+void run(const cli::Options& options, cli::Output& output, char* const* arguments) {
   cli::setEnvironment(options);
   switch (options.command) {
     case cli::Command::List:
@@ -44,9 +45,8 @@ void run(const cli::Options& options, cli::Output& output) {
     case cli::Command::Unregister:
       return cli::runUnregister(options, output);
     case cli::Command::Serve:
-      return cli::runServe(options, output);
     case cli::Command::Passwd:
-      return cli::runPasswd(options, output);
+      return cli::runEndpoint(options, output, arguments);
   }
 }
 
@@ -75,7 +75,7 @@ int mainProgram(int argc, char** argv) {
     return finish(output, line.exitCode);
   }
   try {
-    run(*line.options, output);
+    run(*line.options, output, argv);
     return finish(output, 0);
   } catch (const cli::CommandError& error) {
     // What was printed goes out first: the message is about what is missing from it.

@@ -15,7 +15,6 @@ using declared_test::Lines;
 using declared_test::plain;
 using testing::ElementsAre;
 using testing::HasSubstr;
-using testing::IsEmpty;
 using testing::SizeIs;
 
 class Interop : public Declared {

@@ -71,8 +71,9 @@ std::set<std::string> sourcesWith(const char* extension) {
 }
 
 TEST_F(Install, LaysOutEverythingAndNothingElse) {
-  EXPECT_THAT(namesIn("."), UnorderedElementsAre("bin", "lib", "share"));
+  EXPECT_THAT(namesIn("."), UnorderedElementsAre("bin", "lib", "libexec", "share"));
   EXPECT_THAT(namesIn("bin"), UnorderedElementsAre("swinv"));
+  EXPECT_THAT(namesIn("libexec"), UnorderedElementsAre("swinv-endpoint"));
   EXPECT_THAT(namesIn("lib"), UnorderedElementsAre("libKelvoEndpointProvider.so", "liboru.so",
                                                    "libSoftwareInventoryProvider.so", "systemd"));
   EXPECT_THAT(namesIn("lib/systemd/system"), UnorderedElementsAre("swinv.service", "swinv.socket"));
@@ -89,15 +90,26 @@ TEST_F(Install, LibrariesAreFoundBesideTheirUserAlone) {
     EXPECT_THAT(library.neededLibraries(), testing::Contains("liboru.so")) << file;
   }
   EXPECT_THAT(tests::ElfFile(at("lib/liboru.so").string()).runPaths(), ElementsAre("$ORIGIN"));
-  for (const std::string& path : tests::ElfFile(at("bin/swinv").string()).runPaths()) {
-    EXPECT_THAT(path, testing::StartsWith("$ORIGIN"));
+  for (const char* program : {"bin/swinv", "libexec/swinv-endpoint"}) {
+    for (const std::string& path : tests::ElfFile(at(program).string()).runPaths()) {
+      EXPECT_THAT(path, testing::StartsWith("$ORIGIN")) << program;
+    }
+  }
+}
+
+// What serves brings libraries that take longer to load than most inventories take to print.
+TEST_F(Install, SwinvItselfLoadsNoServer) {
+  for (const std::string& library : tests::ElfFile(at("bin/swinv").string()).neededLibraries()) {
+    EXPECT_THAT(library, testing::MatchesRegex(
+                             "lib(stdc..|m|gcc_s|c)[.]so[.].*|ld-linux.*|libasan.*|libubsan.*|libtsan.*"));
   }
 }
 
 TEST_F(Install, NothingNamesTheBuildTree) {
   for (const fs::directory_entry& entry : fs::recursive_directory_iterator(at("."))) {
     const std::string extension = entry.path().extension().string();
-    if (entry.is_regular_file() && extension != ".so" && entry.path().filename() != "swinv") {
+    if (entry.is_regular_file() && extension != ".so" && entry.path().filename() != "swinv" &&
+        entry.path().filename() != "swinv-endpoint") {
       EXPECT_THAT(readFile(entry.path()), Not(HasSubstr(SWINV_BUILD_FOLDER))) << entry.path();
       EXPECT_THAT(readFile(entry.path()), AllOf(Not(IsEmpty()), Not(HasSubstr("@CMAKE")))) << entry.path();
     }

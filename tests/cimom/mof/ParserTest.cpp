@@ -9,7 +9,6 @@
 namespace {
 
 using cimom::mof::Class;
-using cimom::mof::Declaration;
 using cimom::mof::findQualifier;
 using cimom::mof::Include;
 using cimom::mof::InstanceDeclaration;
@@ -18,7 +17,6 @@ using cimom::mof::Method;
 using cimom::mof::Parser;
 using cimom::mof::Property;
 using cimom::mof::QualifierDeclaration;
-using cimom::mof::Scalar;
 using cimom::mof::textOf;
 using cimom::mof::Value;
 
