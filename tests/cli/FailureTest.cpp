@@ -136,7 +136,9 @@ class MovedSchema : public MovedProgram {
     link("lib");
     fs::create_directories(folder());
     for (const auto& file : fs::directory_iterator(original() / "share" / "swinv" / "schema")) {
-      fs::copy_file(file.path(), folder() / file.path().filename());
+      if (file.is_regular_file()) {
+        fs::copy_file(file.path(), folder() / file.path().filename());
+      }
     }
   }
   [[nodiscard]] fs::path folder() const {

@@ -15,7 +15,6 @@
 
 namespace {
 
-
 constexpr const char* inventoryLibrary = "libSoftwareInventoryProvider.so";
 constexpr const char* endpointLibrary = "libKelvoEndpointProvider.so";
 
