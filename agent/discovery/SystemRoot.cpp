@@ -38,7 +38,7 @@ struct CloseFolder {
 
 /// The target of a link. EINVAL: not a link.
 Outcome<std::string> readLink(const std::string& path) {
-  std::array<char, PATH_MAX> buffer{};
+  std::array<char, PATH_MAX> buffer;  // readlink fills it
   const ssize_t length = ::readlink(path.c_str(), buffer.data(), buffer.size());
   if (length < 0) {
     return {std::nullopt, errno};
