@@ -10,7 +10,7 @@
 /// Runs `work` to its end on a thread of its own with that much stack. What `work` throws ends the program.
 class SmallStackThread {
  public:
-  static constexpr std::size_t stackSize = 256 * 1024;
+  static constexpr std::size_t stackSize = std::size_t{256} * 1024;
 
   explicit SmallStackThread(std::function<void()> work) : work_(std::move(work)) {
     pthread_attr_t attributes;

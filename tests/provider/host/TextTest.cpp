@@ -1,8 +1,8 @@
 // Texts of a machine that are no text: what leaves the providers is valid UTF-8 without control characters,
 // because object managers hand it on as it is.
 #include <gmock/gmock.h>
-#include <stdlib.h>
 
+#include <cstdlib>
 #include <filesystem>
 #include <fstream>
 #include <functional>
