@@ -22,13 +22,6 @@ class UnjudgedDelivery final : public Delivery {
   }
 };
 
-/// For operations that are answered with a status alone.
-class Nothing final : public ResultSink {
- public:
-  bool instance(Instance& /*instance*/) override { return true; }
-  bool path(ObjectPath& /*path*/) override { return true; }
-};
-
 /// The instance with the path that its provider is given.
 const CMPIInstance* placed(Arena& arena, const Instance& instance, const ObjectPath& path) {
   Instance* const copy = instance.copyTo(arena);
@@ -83,8 +76,8 @@ Outcome Changes::modify(const Asked& asked, const Instance& instance) const {
   const Route* const route = routeTo(asked.path, Keys::All, status);
   if (route == nullptr)
     return {std::move(status), false, 0};
-  Nothing nothing;
-  ProviderCall call(*route, asked, route->info->name(), 0, nothing);
+  Nobody nobody;
+  ProviderCall call(*route, asked, route->info->name(), 0, nobody);
   status = call.ask(&ProviderLibrary::instanceMI, &CMPIInstanceMIFT::modifyInstance,
                     placed(call.arena(), instance, asked.path), asked.properties);
   return {std::move(status), call.result().done(), 0};
@@ -96,8 +89,8 @@ Outcome Changes::remove(const Asked& asked) const {
   const Route* const route = routeTo(asked.path, Keys::All, status);
   if (route == nullptr)
     return {std::move(status), false, 0};
-  Nothing nothing;
-  ProviderCall call(*route, asked, route->info->name(), 0, nothing);
+  Nobody nobody;
+  ProviderCall call(*route, asked, route->info->name(), 0, nobody);
   status = call.ask(&ProviderLibrary::instanceMI, &CMPIInstanceMIFT::deleteInstance);
   return {std::move(status), call.result().done(), 0};
 }

@@ -108,13 +108,6 @@ class Placed final : public ResultSink {
   std::size_t count_ = 0;
 };
 
-/// For whoever wants to know only whether there is an object.
-class Nobody final : public ResultSink {
- public:
-  bool instance(Instance& /*instance*/) override { return true; }
-  bool path(ObjectPath& /*path*/) override { return true; }
-};
-
 }  // namespace
 
 bool DeclaredAnswers::mayHold(const NamedValue& reference, const ObjectPath& object) const {

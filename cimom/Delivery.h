@@ -93,6 +93,13 @@ class EnumerationDelivery : public Delivery {
   std::string_view nameSpace_;
 };
 
+/// For whoever wants to know only how a request ended.
+class Nobody final : public ResultSink {
+ public:
+  bool instance(Instance& /*instance*/) override { return true; }
+  bool path(ObjectPath& /*path*/) override { return true; }
+};
+
 /// Takes the answer to a request for one instance, and counts what else comes.
 class SingleAnswer final : public ResultSink {
  public:

@@ -49,13 +49,19 @@ void checkQualifiers(Qualifiers& qualifiers, const Declared& known, const Place&
   }
 }
 
+/// The declaration of a qualifier that subclasses inherit; nullptr for any other.
+const QualifierDeclaration* inheritable(const Qualifier& qualifier, const Declared& known) {
+  const QualifierDeclaration* declaration = known.findQualifierDeclaration(qualifier.name);
+  return declaration != nullptr && declaration->toSubclass() ? declaration : nullptr;
+}
+
 /// The qualifiers in effect where `own` stand over `inherited`.
 Qualifiers merged(const Qualifiers& inherited, const Qualifiers& own, const Declared& known,
                   const Place& place) {
   Qualifiers result;
   for (const Qualifier& each : inherited) {
-    const QualifierDeclaration* declaration = known.findQualifierDeclaration(each.name);
-    if (declaration == nullptr || !declaration->toSubclass())
+    const QualifierDeclaration* declaration = inheritable(each, known);
+    if (declaration == nullptr)
       continue;
     const Qualifier* over = findQualifier(own, each.name);
     const auto& flavors = declaration->flavors;
@@ -119,10 +125,7 @@ class Merge {
 
   /// Leaves those that subclasses inherit.
   void dropOwnOnly(Qualifiers& qualifiers) const {
-    std::erase_if(qualifiers, [this](const Qualifier& each) {
-      const QualifierDeclaration* declaration = known_.findQualifierDeclaration(each.name);
-      return declaration == nullptr || !declaration->toSubclass();
-    });
+    std::erase_if(qualifiers, [this](const Qualifier& each) { return inheritable(each, known_) == nullptr; });
   }
 
   void addProperty(std::size_t index) {
